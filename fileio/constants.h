@@ -1,0 +1,28 @@
+#pragma once
+
+#include <cstddef>
+
+// Sizes that decide where work is cut into pieces. None of them shows in a result; the `small`
+// preset shrinks them so that short tests cross every boundary.
+namespace Orvandeil::FileIO::constants {
+
+#ifdef FILEIO_SMALL_CONSTANTS
+// Bytes moved by one standard-library read or write.
+inline constexpr std::size_t transferPieceBytes = 64;
+// Bytes decoded, and UTF-16 bytes encoded, by one converter call.
+inline constexpr std::size_t converterPieceBytes = 48;
+// First block of a string output stream, in bytes. Callers may rely on it, so it never shrinks.
+inline constexpr std::size_t firstOutputBlockBytes = 1024;
+// Stack space tried before a formatted number gets a block of its own.
+inline constexpr std::size_t numberScratchBytes = 8;
+// Pad characters written at once.
+inline constexpr std::size_t paddingBlockUnits = 3;
+#else
+inline constexpr std::size_t transferPieceBytes = 1048576;
+inline constexpr std::size_t converterPieceBytes = 0x3FFFFFFF;
+inline constexpr std::size_t firstOutputBlockBytes = 1024;
+inline constexpr std::size_t numberScratchBytes = 512;
+inline constexpr std::size_t paddingBlockUnits = 256;
+#endif
+
+}  // namespace Orvandeil::FileIO::constants

@@ -1,0 +1,79 @@
+#pragma once
+
+#include "fileio/buffers/output_buffer.h"
+#include "fileio/export.h"
+#include "fileio/streams/stream.h"
+
+#include <cstddef>
+#include <string>
+#include <string_view>
+
+#include <unicode/ucnv.h>
+
+namespace Orvandeil::FileIO {
+
+// A stream that carries text: it decodes the bytes of its encoding into UTF-16 and encodes UTF-16
+// into them, with one ICU converter and ICU's substitution callbacks. Characters beyond the Basic
+// Multilingual Plane are decoded as the single unit U+001A, so that no engine meets surrogates.
+//
+// Without an encoding name the encoding is decided by DetectCharset at the first need; until a
+// byte other than 7-bit ASCII is read there is none.
+class FILEIO_API TcodnStream : public stream {
+public:
+    // An unknown name raises "KESTRA:iofun:InvalidEncoding". Sets the numeric locale to "C".
+    explicit TcodnStream(std::string encoding);
+    ~TcodnStream() override;
+
+    // Writes `n` code units as they are, in native byte order. Returns the units written.
+    virtual unsigned long PutNCharacters(unsigned long n, const char16_t* text);
+
+    // The name of the character set of the data from `startOffset` on.
+    virtual std::string DetectCharset(unsigned long startOffset) const = 0;
+
+    // The converter, opened by DetectCharset(n) if there is none yet; `n` is the number of leading
+    // ASCII bytes of the read in progress.
+    UConverter* GetConv(unsigned long n);
+
+    // The host's canonical name of the encoding.
+    std::string GetEncodingName();
+
+    // Decode up to `n` units, or everything to the end of the data, and return the number of units
+    // produced. `bytesConsumed` (may be null) receives the bytes that they took.
+    unsigned long GetNCodePoints(char16_t* out, unsigned long n, std::size_t* bytesConsumed);
+    unsigned long GetNCodePoints(OutputBuffer& buffer, unsigned long n, std::size_t* bytesConsumed);
+    // Returns only the units of the last round; the buffer's size tells the rest.
+    unsigned long GetNCodePoints(OutputBuffer& buffer, std::size_t* bytesConsumed);
+    unsigned long GetNCodePoints(std::u16string& text, unsigned long n, std::size_t* bytesConsumed);
+
+    // Reads one word between breakable spaces, at most `width` units unless `noLimit`. The space
+    // behind it stays unread. Returns the units stored.
+    unsigned long GetString(OutputBuffer& buffer, long width, bool noLimit);
+
+    // Reads past breakable spaces.
+    void SkipWhiteSpace();
+
+    // Encodes and writes `n` units with one PutNElements. Returns `n` when every byte went out and
+    // else 0; in an encoding of fixed size, the characters written. A high surrogate at the end is
+    // held for the next call.
+    unsigned long PutString(const char16_t* text, unsigned long n);
+    unsigned long PutString(std::u16string_view text) {
+        return PutString(text.data(), text.size());
+    }
+
+    // PutString of `n` ASCII bytes; a byte above 0x7F writes nothing and returns 0.
+    int PutASCIIString(const char* text, int n);
+
+private:
+    friend struct LayoutProbe;
+
+    UConverter* converter = nullptr;
+    bool latinFixed = false;
+    bool utf16 = false;
+    bool asciiSoFar;
+    std::string readBytes;
+    std::u16string oneChar;
+    std::string writeBytes;
+    std::u16string asciiText;
+};
+
+}  // namespace Orvandeil::FileIO
