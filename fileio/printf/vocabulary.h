@@ -29,12 +29,17 @@ enum PrintfSubformat : int {
 
 // A set of these bits.
 enum PrintFormatFlags : int {
+    NoFlags = 0,
     LeftJustify = 1,  // -
     ShowSign = 2,     // +
     SpaceSign = 4,    // blank
     Alternate = 8,    // #
     ZeroPad = 16      // 0
 };
+
+constexpr PrintFormatFlags operator|(PrintFormatFlags a, PrintFormatFlags b) {
+    return static_cast<PrintFormatFlags>(static_cast<int>(a) | static_cast<int>(b));
+}
 
 // Where a width or precision comes from.
 enum WidthPrecisionFieldType : int {

@@ -1,0 +1,189 @@
+#include "fileio/printf/fout_format_piece.h"
+
+#include "fileio/constants.h"
+#include "fileio/errors/code_list.h"
+#include "fileio/printf/fout_format_pieces.h"
+#include "fileio/printf/printf_argument_source.h"
+#include "fileio/text/known_streams.h"
+#include "fileio/text/tcodn_stream.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstring>
+#include <limits>
+
+namespace Orvandeil::FileIO {
+namespace {
+
+static_assert(code::BadWidthNaN == -15 && code::BadWidthEmptyArg == -19 &&
+              code::BadPrecisionNaN == -20 && code::BadPrecisionEmptyArg == -24);
+
+// The digits before the point: 309 for the largest double, 22 for 64 bits in octal; one for a sign.
+template <class T>
+constexpr unsigned long integerDigits = std::is_floating_point_v<T> ? 310 : 23;
+
+std::string exponentForm(const std::string& text) {
+    return text.substr(0, text.find_last_not_of("hlbtdiouxXeEfgGsc") + 1) + 'e';
+}
+
+std::string withoutArgumentPrecision(const std::string& text) {
+    std::string shorter = text;
+    return shorter.erase(text.rfind(".*"), std::strlen(".*"));
+}
+
+bool fitsInt(long number) {
+    return number <= std::numeric_limits<int>::max();
+}
+
+// What printf makes of a field wider than an int can tell: nothing, and a failure.
+int printTooWide(TcodnStream* out) {
+    const char* const tooWide = "%2147483648d";
+    return out->printf(tooWide, 0);
+}
+
+void checkPrinted(TcodnStream* out, int result) {
+    if (result < 0) throw out->getErrorCode();
+}
+
+}  // namespace
+
+const FieldValidatorT<15, 17, 16, 18, 19> foutFormatPiece::widthValidator;
+const FieldValidatorT<20, 22, 21, 23, 24> foutFormatPiece::precisionValidator;
+
+foutFormatPiece::foutFormatPiece(const foutFormatPieceInitBlock& init)
+    : numberedIndex(init.numberedIndex),
+      flags(init.flags),
+      forceSign(init.forceSign),
+      width(widthValidator, init.widthKind, init.width),
+      precision(precisionValidator, init.precisionKind, init.precision),
+      formatPosition(init.formatPosition),
+      conversion(init.conversion),
+      subformat(init.subformat) {
+    variants[AsParsed] = std::make_unique<std::string>(init.printfFormat);
+}
+
+foutFormatPiece::~foutFormatPiece() = default;
+
+std::u16string_view foutFormatPiece::getLiteralText() const {
+    const auto* literal = dynamic_cast<const foutFormatPieceForLiterals*>(this);
+    return literal == nullptr ? std::u16string_view() : literal->getText();
+}
+
+unsigned long foutFormatPiece::getBufferSize() const {
+    return static_cast<unsigned long>(precision.getEffective() + width.getEffective() + 20);
+}
+
+void foutFormatPiece::setup(printfArgumentSource* source) {
+    width.setup(source);
+    precision.setup(source);
+    chooseVariant();
+}
+
+void foutFormatPiece::chooseVariant() {
+    variant = AsParsed;
+    if (precision.isNegative()) useVariant(NoPrecision, withoutArgumentPrecision);
+}
+
+// Builds the variant from the one in use, once, and switches to it.
+void foutFormatPiece::useVariant(Variant wanted, std::string (*build)(const std::string&)) {
+    if (!variants[wanted]) {
+        variants[wanted] = std::make_unique<std::string>(build(*variants[variant]));
+    }
+    variant = wanted;
+}
+
+void foutFormatPiece::print(TcodnStream* out, printfArgumentSource* source) {
+    if (numberedIndex != 0) source->setCurrentArgument(numberedIndex);
+    switch (decidePrintMode(source)) {
+        case NotPrintable:
+        case EmptyArgument:
+            return printAsE(out, source);
+        case NonFinite:
+            return printNonFinite(out, source);
+        case Printable:
+            return printByType(out, source);
+    }
+}
+
+template <class T>
+void foutFormatPiece::printAs(TcodnStream* out, printfArgumentSource* source) {
+    if (!source->prepareCurrentArgument(true)) return printWidthBuffer(out, 0);
+    const T value = source->getCurrentArgumentAs<T>();
+    if (out->needsBufferSize()) out->setBufferSize(getBufferSize() + integerDigits<T>);
+    checkPrinted(out, printValue(out, value));
+}
+
+template void foutFormatPiece::printAs<double>(TcodnStream*, printfArgumentSource*);
+template void foutFormatPiece::printAs<long>(TcodnStream*, printfArgumentSource*);
+template void foutFormatPiece::printAs<unsigned long>(TcodnStream*, printfArgumentSource*);
+
+// A negative width argument is passed as its magnitude: it justifies numbers to the right, while
+// text goes to the left. That difference is kept on purpose.
+template <class T>
+int foutFormatPiece::printValue(TcodnStream* out, T value) const {
+    const char* const text = variants[variant]->c_str();
+    const bool passPrecision = precision.isFromArgument() && !precision.isNegative();
+    const int precisionPassed = static_cast<int>(precision.getEffective());
+    if (!width.isFromArgument()) {
+        return passPrecision ? out->printf(text, precisionPassed, value) : out->printf(text, value);
+    }
+    if (!fitsInt(width.getEffective())) return printTooWide(out);
+    const int widthPassed = static_cast<int>(width.getEffective());
+    return passPrecision ? out->printf(text, widthPassed, precisionPassed, value)
+                         : out->printf(text, widthPassed, value);
+}
+
+void foutFormatPiece::printAsE(TcodnStream* out, printfArgumentSource* source) {
+    useVariant(variant == NoPrecision ? ExponentNoPrecision : Exponent, exponentForm);
+    printAs<double>(out, source);
+}
+
+void foutFormatPiece::printNonFinite(TcodnStream* out, printfArgumentSource* source) {
+    const double value = source->getCurrentArgumentAs<double>();
+    const char* text = "Inf";
+    if (std::isnan(value)) {
+        text = forceSign ? "+NaN" : "NaN";
+    } else if (value < 0) {
+        text = "-Inf";
+    } else if (hasFlag(ShowSign) || width.isNegative()) {
+        // A negative width asks for the sign as well; kept on purpose.
+        text = "+Inf";
+    } else if (hasFlag(SpaceSign)) {
+        text = " Inf";
+    }
+    if (out->needsBufferSize()) {
+        out->setBufferSize(static_cast<unsigned long>(std::max(width.getEffective(), 4L)));
+    }
+    printField(out, width.getEffective(), isLeftJustified(), text);
+}
+
+void foutFormatPiece::printField(TcodnStream* out, long fieldWidth, bool left,
+                                 const char* text) const {
+    const bool fits = fitsInt(fieldWidth);
+    const int widthPassed = fits ? static_cast<int>(fieldWidth) : 0;
+    const int result = !fits  ? printTooWide(out)
+                       : left ? out->printf("%-*s", widthPassed, text)
+                              : out->printf("%*s", widthPassed, text);
+    checkPrinted(out, result);
+}
+
+void foutFormatPiece::printWidthBuffer(TcodnStream* out, unsigned long printed) const {
+    char16_t pads[constants::paddingBlockUnits];
+    std::fill(std::begin(pads), std::end(pads), hasFlag(ZeroPad) ? u'0' : u' ');
+    // A stream that the library does not know sees every pad as a write of its own.
+    const unsigned long block = detail::isKnownStream(*out) ? std::size(pads) : 1;
+    const unsigned long wanted = static_cast<unsigned long>(width.getEffective());
+    for (unsigned long done = printed; done < wanted;) {
+        const unsigned long count = std::min(block, wanted - done);
+        if (out->PutString(pads, count) < count) throw out->getErrorCode();
+        done += count;
+    }
+}
+
+void foutFormatPiece::printPadded(TcodnStream* out, std::u16string_view content) const {
+    if (!isLeftJustified()) printWidthBuffer(out, content.size());
+    if (!content.empty() && out->PutString(content) < content.size()) throw out->getErrorCode();
+    if (isLeftJustified()) printWidthBuffer(out, content.size());
+}
+
+}  // namespace Orvandeil::FileIO

@@ -1,0 +1,131 @@
+#pragma once
+
+#include "fileio/export.h"
+#include "fileio/memory_operation_overloads.h"
+#include "fileio/printf/format_field.h"
+#include "fileio/printf/printability.h"
+#include "fileio/printf/vocabulary.h"
+
+#include <memory>
+#include <string>
+#include <string_view>
+
+namespace Orvandeil::FileIO {
+
+class TcodnStream;
+class printfArgumentSource;
+
+// What the parser found out about one piece.
+struct foutFormatPieceInitBlock {
+    std::string printfFormat;  // for the C library; empty for a literal
+    unsigned long numberedIndex = 0;
+    PrintFormatFlags flags = NoFlags;
+    WidthPrecisionFieldType widthKind = FieldAbsent;
+    int width = 0;
+    WidthPrecisionFieldType precisionKind = FieldAbsent;
+    int precision = 0;
+    bool forceSign = false;
+    unsigned long formatPosition = 0;
+    PrintfFormat conversion = NoConversion;
+    PrintfSubformat subformat = NoSubformat;
+};
+
+// One piece of an output format. Printing takes width and precision from the arguments where the
+// format says "*", decides how the current value can be shown, takes the value and writes it. All
+// failures are thrown as int: a code of the argument source or of a field, "NoMemory", or the
+// stream's code after a failed or short write.
+class FILEIO_API foutFormatPiece : public fiMemoryOperationOverloads {
+public:
+    explicit foutFormatPiece(const foutFormatPieceInitBlock& init);
+    foutFormatPiece(const foutFormatPiece&) = delete;
+    foutFormatPiece& operator=(const foutFormatPiece&) = delete;
+    virtual ~foutFormatPiece();
+
+    // `subformatText` is the printf text of a conversion, or the text of a literal.
+    static std::unique_ptr<foutFormatPiece> createFoutFormatPiece(
+        PrintfFormat conversion, PrintfSubformat subformat, unsigned long numberedIndex,
+        PrintFormatFlags flags, WidthPrecisionFieldType widthKind, int width,
+        WidthPrecisionFieldType precisionKind, int precision, const std::u16string& subformatText,
+        bool forceSign, unsigned long formatPosition);
+
+    virtual bool consumesData() const { return true; }
+    virtual bool isUnsigned() const { return false; }
+    // Writes the current value in the conversion's own form.
+    virtual void printByType(TcodnStream* out, printfArgumentSource* source) = 0;
+    // The characters needed beside the digits of the value.
+    virtual unsigned long getBufferSize() const;
+    // How the current argument can be shown.
+    virtual Printability decidePrintMode(printfArgumentSource* source) const = 0;
+
+    void printFormattedOutputToDestination(TcodnStream* out, printfArgumentSource* source) {
+        setup(source);
+        print(out, source);
+    }
+    void setup(printfArgumentSource* source);
+    void print(TcodnStream* out, printfArgumentSource* source);
+
+    PrintfFormat getConversion() const { return conversion; }
+    PrintfSubformat getSubformat() const { return subformat; }
+    PrintFormatFlags getFlags() const { return flags; }
+    unsigned long getNumberedIndex() const { return numberedIndex; }
+    WidthPrecisionFieldType getWidthKind() const { return width.getKind(); }
+    int getWidthValue() const { return width.getValue(); }
+    WidthPrecisionFieldType getPrecisionKind() const { return precision.getKind(); }
+    int getPrecisionValue() const { return precision.getValue(); }
+    const std::string& getPrintfText() const { return *variants[AsParsed]; }
+    // The text of a literal; empty for a conversion.
+    std::u16string_view getLiteralText() const;
+    // Where the piece stands in the format; for a literal in front of a "%", the place of the "%".
+    unsigned long getFormatPosition() const { return formatPosition; }
+
+protected:
+    // Writes the value as T through the C library's printf; only padding for an empty argument.
+    template <class T>
+    void printAs(TcodnStream* out, printfArgumentSource* source);
+    void printAsE(TcodnStream* out, printfArgumentSource* source);
+    void printNonFinite(TcodnStream* out, printfArgumentSource* source);
+    // Pads from `printed` characters to the width.
+    void printWidthBuffer(TcodnStream* out, unsigned long printed) const;
+    // Pads `content` on the side that the justification asks for.
+    void printPadded(TcodnStream* out, std::u16string_view content) const;
+    // Writes a text right-justified in `fieldWidth`, or left-justified.
+    void printField(TcodnStream* out, long fieldWidth, bool left, const char* text) const;
+
+    bool hasFlag(PrintFormatFlags flag) const { return (flags & flag) != 0; }
+    bool isLeftJustified() const { return hasFlag(LeftJustify) || width.isNegative(); }
+    // A negative precision from an argument counts as none.
+    bool hasPrecision() const { return precision.isPresent() && !precision.isNegative(); }
+
+private:
+    friend struct LayoutProbe;
+
+    // The printf texts of a piece: as parsed, in exponent form, and both without the ".*" of a
+    // negative precision. All but the first are built when they are first needed.
+    enum Variant : int { AsParsed = 0, Exponent = 1, NoPrecision = 2, ExponentNoPrecision = 3 };
+    static constexpr int variantCount = 4;
+
+    void chooseVariant();
+    void useVariant(Variant wanted, std::string (*build)(const std::string&));
+    template <class T>
+    int printValue(TcodnStream* out, T value) const;
+
+    static const FieldValidatorT<15, 17, 16, 18, 19> widthValidator;
+    static const FieldValidatorT<20, 22, 21, 23, 24> precisionValidator;
+
+    std::unique_ptr<std::string> variants[variantCount];
+    Variant variant = AsParsed;
+    unsigned long numberedIndex;
+    PrintFormatFlags flags;
+    bool forceSign;
+
+protected:
+    FormatField width;
+    FormatField precision;
+
+private:
+    unsigned long formatPosition;
+    PrintfFormat conversion;
+    PrintfSubformat subformat;
+};
+
+}  // namespace Orvandeil::FileIO

@@ -1,0 +1,100 @@
+#pragma once
+
+#include "fileio/export.h"
+#include "fileio/printf/conversion_token.h"
+#include "fileio/printf/fout_format_piece.h"
+#include "fileio/printf/vocabulary.h"
+
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace Orvandeil::FileIO {
+
+// Splits an output format, escapes already converted, into pieces: literal runs and conversions.
+// It knows neither arguments nor output. A malformed conversion ends the parse but is reported only
+// when the pieces before it are used up, so that everything in front of it is still printed.
+class FILEIO_API PrintFormatParser {
+public:
+    enum PrintFormatArgumentType : int {
+        ArgumentsNone = 0,  // no conversion has referred to an argument
+        ArgumentsSequential = 1,
+        ArgumentsNumbered = 2
+    };
+
+    // With `forceSign` every number gets a sign and widths are dropped, their "*" included. Never
+    // throws for a bad format.
+    PrintFormatParser(std::u16string format, bool forceSign);
+    PrintFormatParser(const PrintFormatParser&) = delete;
+    PrintFormatParser& operator=(const PrintFormatParser&) = delete;
+    virtual ~PrintFormatParser();
+
+    // The next piece, owned by the parser; null behind the last one. Where an error was recorded,
+    // its code is thrown as an int instead.
+    foutFormatPiece* getNextPrintFormatPiece();
+
+    // Starts over with the first piece. A numbered format is used only once: nothing happens.
+    void resetParser();
+
+    // Whether the last conversion is left-justified and only breakable space follows it.
+    bool trailingWhitespaceIsLeftJustification() const;
+
+    // Writes the format as it stands, from the place of the piece last returned to its end. Throws
+    // the stream's code as an int after a short write, std::out_of_range when no piece was taken.
+    void printRemainingFormatAsLiteral(TcodnStream* out) const;
+
+    PrintFormatArgumentType getArgumentType() const { return argumentType; }
+    // The conversions other than "%%", and the "*" that take the next argument.
+    unsigned long getConversionCount() const { return conversionCount; }
+    bool getHasStringConversion() const { return hasStringConversion; }
+    // 0, or the code of the first malformed conversion.
+    int getRecordedError() const { return recordedError; }
+
+private:
+    friend struct LayoutProbe;
+
+    void parse();
+    void parseConversion(std::size_t position);
+    bool specialCasePercent();
+    void extractNumberedArgPart();
+    void extractFlagsPart();
+    void extractWidthPart();
+    void extractPrecisionPart();
+    void extractSubFormatPart();
+    void extractFormatPart();
+    void extractIntegerFormat(PrintfFormat kind, bool bitPatternAllowed);
+    void extractPlainFormat(PrintfFormat kind);
+    // What the "*" of a width or precision refers to, `digits` being the text behind it.
+    WidthPrecisionFieldType extractReference(std::u16string_view digits, int& number);
+    void setArgumentType(PrintFormatArgumentType type);
+    void pushLiteral(std::size_t from, std::size_t to, std::size_t position);
+    void pushFormat(unsigned long position);
+    void resetStateForNextPiece();
+    void recordInvalidFormat();
+
+    std::u16string formatText;
+    const char16_t* formatCharacters;
+    bool forceSign;
+    unsigned long conversionCount = 0;
+    bool hasStringConversion = false;
+    bool lastLeftJustified = false;
+    const char16_t* trailingLiteral = nullptr;
+
+    unsigned int numberedIndex = 0;
+    PrintFormatFlags flags = NoFlags;
+    int widthValue = 0;
+    WidthPrecisionFieldType widthKind = FieldAbsent;
+    int precisionValue = 0;
+    WidthPrecisionFieldType precisionKind = FieldAbsent;
+    PrintfSubformat subformat = NoSubformat;
+    PrintfFormat conversion = NoConversion;
+    std::u16string subformatText;
+    detail::ConversionToken match;
+
+    PrintFormatArgumentType argumentType = ArgumentsNone;
+    std::vector<std::unique_ptr<foutFormatPiece>> pieces;
+    unsigned long nextPiece = 0;
+    int recordedError = 0;
+};
+
+}  // namespace Orvandeil::FileIO

@@ -1,0 +1,243 @@
+#include "fileio/printf/printf_argument_source.h"
+
+#include "fileio/buffers/element_conversion.h"
+#include "fileio/buffers/host_array.h"
+#include "fileio/errors/code_list.h"
+#include "fileio/errors/identifiers.h"
+#include "fileio/host/dispatch.h"
+#include "fileio/host/memory.h"
+#include "fileio/host/messages.h"
+#include "fileio/printf/element_range.h"
+
+namespace Orvandeil::FileIO {
+namespace {
+
+std::size_t product(const std::vector<std::size_t>& lengths, std::size_t from) {
+    std::size_t result = 1;
+    for (std::size_t i = from; i < lengths.size(); ++i) {
+        if (__builtin_mul_overflow(result, lengths[i], &result)) vxMemoryRaiseExhausted();
+    }
+    return result;
+}
+
+std::vector<std::size_t> objectDimensions(const vxArray* object) {
+    const detail::HostArray size(vxDispatchCall("size", &object, 1));
+    const bool usable = size && vxArrayClassID(size.get()) == vxDOUBLE_CLASS &&
+                        vxArrayIsVector(size.get()) && !vxArrayIsScalar(size.get());
+    if (!usable) vxErrMsgId(KESTRA::printf::invalidSizeResult(vxArrayClassName(object)));
+    const std::size_t* shape = vxArrayDimensions(size.get());
+    std::vector<std::size_t> dimensions(shape[0] * shape[1]);
+    AssignToVoidBuffer(vxUINT64_CLASS, dimensions.data(), VxData(size.get()), dimensions.size());
+    return dimensions;
+}
+
+std::vector<std::size_t> dimensionsOf(const vxArray* array) {
+    if (vxArrayClassID(array) == vxOBJECT_CLASS) return objectDimensions(array);
+    const std::size_t* first = vxArrayDimensions(array);
+    return {first, first + vxArrayDimensionCount(array)};
+}
+
+}  // namespace
+
+printfArgumentSource::printfArgumentSource(const vxArray** arguments, std::size_t count)
+    : args(arguments), argc(count) {}
+
+printfArgumentSource::~printfArgumentSource() = default;
+
+void printfArgumentSource::setupArg() {
+    if (data) clearArg();
+    elementIndex = 0;
+    if (argIndex >= argc) return;
+    dims = dimensionsOf(args[argIndex]);
+    argLength = product(dims, 0);
+    data = std::make_unique<VxData>(args[argIndex]);
+}
+
+void printfArgumentSource::clearArg() {
+    data.reset();
+    argLength = 0;
+}
+
+bool printfArgumentSource::hasMoreData() const {
+    return remainingArgumentLength() != 0 || hasMoreArgs();
+}
+
+void printfArgumentSource::setCurrentArgument(std::size_t) {}
+
+bool printfArgumentSource::hasCurrentArg() const {
+    return data != nullptr;
+}
+
+bool printfArgumentSource::hasMoreArgs() const {
+    return argIndex < argc;
+}
+
+bool printfArgumentSource::advanceArgument() {
+    advanceArgumentIndex();
+    // An argument without elements is passed by the first step already.
+    if (elementIndex >= argLength) consumeArgument();
+    return true;
+}
+
+void printfArgumentSource::advanceArgumentIndex() {
+    ++elementIndex;
+}
+
+std::size_t printfArgumentSource::remainingArgumentLength() const {
+    return argLength - elementIndex;
+}
+
+void printfArgumentSource::consumeArgument() {}
+
+bool printfArgumentSource::canUsePercentSOptimization() {
+    return data->getClassID() == vxCHAR_CLASS || data->isObject();
+}
+
+bool printfArgumentSource::prepareCurrentArgument(bool allowEmpty) {
+    if (!hasCurrentArg()) {
+        advanceArgument();
+        throw code::NotEnoughArgs;
+    }
+    if (!isCurrentArgumentEmpty()) return true;
+    advanceArgument();
+    if (!allowEmpty) throw code::EmptyArg;
+    return false;
+}
+
+std::u16string_view printfArgumentSource::getCurrentArgumentAsString(std::u16string& out) {
+    out.clear();
+    if (!hasCurrentArg()) {
+        // Lets a source that picks by number say that there is no such argument.
+        advanceArgument();
+        throw code::NotEnoughArgs;
+    }
+    if (data->isObject() && isCurrentArgumentEmpty()) {
+        consumeArgument();
+        throw code::EmptyArg;
+    }
+    const std::size_t remaining = remainingArgumentLength();
+    if (!canUsePercentSOptimization()) {
+        out.reserve(remaining);
+        for (std::size_t i = 0; i < remaining && isCharacterCode(); ++i) {
+            out += data->getIndexAs<char16_t>(elementIndex);
+            advanceArgument();
+        }
+        if (out.empty()) advanceArgument();
+        return out;
+    }
+    if (data->isObject()) {
+        out = data->getIndexAs<std::u16string>(elementIndex);
+        advanceArgument();
+        return out;
+    }
+    const auto* characters = static_cast<const char16_t*>(data->getElements()) + elementIndex;
+    consumeArgument();
+    return {characters, remaining};
+}
+
+bool printfArgumentSource::isCharacterCode() const {
+    return hasCurrentArg() && !isCurrentArgumentEmpty() &&
+           detail::isRepresentable<std::uint16_t>(*data, elementIndex);
+}
+
+namespace {
+
+// The integer type whose values a conversion to T can show; any finite number for double.
+template <class T>
+bool isShowable(const VxData& data, std::size_t index) {
+    return detail::isRepresentable<T>(data, index);
+}
+template <>
+bool isShowable<char16_t>(const VxData& data, std::size_t index) {
+    return detail::isRepresentable<std::uint16_t>(data, index);
+}
+template <>
+bool isShowable<double>(const VxData&, std::size_t) {
+    return true;
+}
+
+}  // namespace
+
+template <class T>
+Printability printfArgumentSource::checkPrintabilityByType() const {
+    if (isCurrentArgumentEmpty()) return EmptyArgument;
+    if (!hasCurrentArg()) return Printable;
+    if (detail::isNonFinite(*data, elementIndex)) return NonFinite;
+    if (data->isObject() || isShowable<T>(*data, elementIndex)) return Printable;
+    return NotPrintable;
+}
+
+template FILEIO_API Printability printfArgumentSource::checkPrintabilityByType<long>() const;
+template FILEIO_API Printability
+printfArgumentSource::checkPrintabilityByType<unsigned long>() const;
+template FILEIO_API Printability printfArgumentSource::checkPrintabilityByType<double>() const;
+template FILEIO_API Printability printfArgumentSource::checkPrintabilityByType<char16_t>() const;
+
+printfSequentialArgumentSource::printfSequentialArgumentSource(const vxArray** arguments,
+                                                               std::size_t count)
+    : printfArgumentSource(arguments, count) {
+    setupArg();
+}
+
+void printfSequentialArgumentSource::consumeArgument() {
+    ++argIndex;
+    setupArg();
+}
+
+bool printfNumberedArgumentSource::hasMoreData() const {
+    return false;
+}
+
+void printfNumberedArgumentSource::setCurrentArgument(std::size_t n) {
+    argIndex = n - 1;
+    setupArg();
+}
+
+bool printfNumberedArgumentSource::advanceArgument() {
+    if (!hasCurrentArg()) throw code::NumberedMoreThanArgc;
+    if (!isCurrentArgumentScalar()) throw code::NonScalarNumbered;
+    return true;
+}
+
+printfMatrixArgumentSource::printfMatrixArgumentSource(const vxArray** arg)
+    : printfArgumentSource(arg, 1) {
+    setupArg();
+}
+
+bool printfMatrixArgumentSource::hasCurrentArg() const {
+    return !dims.empty() && column < columnCount();
+}
+
+bool printfMatrixArgumentSource::hasMoreArgs() const {
+    return false;
+}
+
+void printfMatrixArgumentSource::advanceArgumentIndex() {
+    ++column;
+    if (column <= columnCount()) elementIndex += dims.front();
+}
+
+std::size_t printfMatrixArgumentSource::remainingArgumentLength() const {
+    return columnCount() - column;
+}
+
+bool printfMatrixArgumentSource::canUsePercentSOptimization() {
+    return data->isObject();
+}
+
+void printfMatrixArgumentSource::setRow(std::size_t r) {
+    rowStart = r;
+    elementIndex = r;
+    resetRow();
+}
+
+void printfMatrixArgumentSource::resetRow() {
+    if (elementIndex >= argLength) elementIndex = rowStart;
+    column = 0;
+}
+
+std::size_t printfMatrixArgumentSource::columnCount() const {
+    return product(dims, 1);
+}
+
+}  // namespace Orvandeil::FileIO

@@ -1,0 +1,47 @@
+#pragma once
+
+#include "fileio/export.h"
+#include "fileio/printf/print_format_parser.h"
+#include "fileio/printf/printf_argument_source.h"
+
+#include <memory>
+#include <string>
+
+namespace Orvandeil::FileIO {
+
+// One call of formatted output: prints the pieces of a format to a stream, again and again while
+// argument data remains. Stream and arrays are not owned and outlive the controller.
+class FILEIO_API printfController {
+public:
+    // Never fails for a bad format; doPrintf tells. Raises what the "size" of an object raises.
+    printfController(std::u16string format, TcodnStream* out, const vxArray** args, int count);
+    printfController(const printfController&) = delete;
+    printfController& operator=(const printfController&) = delete;
+    ~printfController();
+
+    // Prints everything. True when the output is complete. False when it failed: getErrorCode()
+    // is then a code of the library or of the stream, and it may be 0 when a stream wrote short
+    // without a cause. What was written before stays written. NotEnoughArgs tells that the data
+    // ended within the format, which hosts take for an ordinary end. Errors that the host raises
+    // pass through.
+    bool doPrintf();
+
+    int getErrorCode() const { return errorCode; }
+    const PrintFormatParser& getParser() const { return parser; }
+    // The piece that was being printed; null before the first.
+    const foutFormatPiece* getCurrentPiece() const { return currentPiece; }
+
+private:
+    friend struct LayoutProbe;
+
+    void printAllPasses();
+    bool takePiece();
+
+    int errorCode = 0;
+    PrintFormatParser parser;
+    std::unique_ptr<printfArgumentSource> source;
+    foutFormatPiece* currentPiece = nullptr;
+    TcodnStream* output;
+};
+
+}  // namespace Orvandeil::FileIO

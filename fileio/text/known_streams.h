@@ -1,0 +1,15 @@
+#pragma once
+
+#include "fileio/text/output_string_stream.h"
+
+#include <typeinfo>
+
+namespace Orvandeil::FileIO::detail {
+
+// Whether the stream is exactly one of the library's own, so that how a text is cut into writes
+// shows nowhere. A class derived from them may watch its writes.
+inline bool isKnownStream(const TcodnStream& out) {
+    return typeid(out) == typeid(outputStringStream);
+}
+
+}  // namespace Orvandeil::FileIO::detail

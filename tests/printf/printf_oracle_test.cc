@@ -1,0 +1,151 @@
+#include "tests/support/printing.h"
+
+#include <array>
+#include <cstdio>
+#include <limits>
+
+#include <gtest/gtest.h>
+
+// Every set of flags, with every width and precision, against the C library's own printf: it is the
+// referee for whatever a number looks like.
+
+using namespace Orvandeil::FileIO::embedded;
+
+namespace {
+
+const char* const widths[] = {"", "1", "7", "30"};
+const char* const precisions[] = {"", ".", ".0", ".3", ".17"};
+
+std::vector<std::string> conversionTexts(const std::string& flagLetters) {
+    std::vector<std::string> texts;
+    for (unsigned set = 0; set < 32; ++set) {
+        std::string flags;
+        for (std::size_t i = 0; i < flagLetters.size(); ++i) {
+            if (set >> i & 1) flags += flagLetters[i];
+        }
+        for (const char* width : widths) {
+            for (const char* precision : precisions)
+                texts.push_back('%' + flags + width + precision);
+        }
+    }
+    return texts;
+}
+
+template <class... Arguments>
+std::string formatted(const std::string& format, Arguments... arguments) {
+    std::array<char, 1024> text{};
+    std::snprintf(text.data(), text.size(), format.c_str(), arguments...);
+    return text.data();
+}
+
+TEST(PrintfOracle, WholeNumbersOfEveryFlagWidthAndPrecision) {
+    const double values[] = {0, -0.0, 7, -7, 123456789, 9007199254740992.0, -9.2233720368547758e18};
+    for (const std::string& text : conversionTexts("-+ #0")) {
+        for (const double value : values) {
+            const ArrayPtr argument = makeScalar(value);
+            for (const std::string conversion : {"d", "i", "u", "o", "x", "X"}) {
+                const bool isSigned = conversion == "d" || conversion == "i";
+                if (!isSigned && value < 0) continue;
+                const std::string format = text + "ll" + conversion;
+                EXPECT_EQ(fileio_tests::print(text + conversion, argument).text,
+                          formatted(format, static_cast<long long>(value)))
+                    << text << conversion << " of " << value;
+            }
+        }
+    }
+}
+
+TEST(PrintfOracle, RealNumbersOfEveryFlagWidthAndPrecision) {
+    const double values[] = {0,
+                             -0.0,
+                             2.5,
+                             -1.0 / 3,
+                             1e100,
+                             std::numeric_limits<double>::max(),
+                             std::numeric_limits<double>::denorm_min()};
+    for (const std::string& text : conversionTexts("-+ #0")) {
+        for (const double value : values) {
+            const ArrayPtr argument = makeScalar(value);
+            for (const char* conversion : {"e", "E", "f", "g", "G"}) {
+                EXPECT_EQ(fileio_tests::print(text + conversion, argument).text,
+                          formatted(text + conversion, value))
+                    << text << conversion << " of " << value;
+            }
+        }
+    }
+}
+
+// A value that a conversion cannot hold is shown in the exponent form of the same flags.
+TEST(PrintfOracle, ExponentFormKeepsFlagsWidthAndPrecision) {
+    for (const std::string& text : conversionTexts("-+ #0")) {
+        const ArrayPtr fraction = makeScalar(-2.5);
+        for (const char* conversion : {"d", "lu", "hX", "o", "s"}) {
+            EXPECT_EQ(fileio_tests::print(text + conversion, fraction).text,
+                      formatted(text + "e", -2.5))
+                << text << conversion;
+        }
+    }
+}
+
+// Each class prints the values it can hold exactly, up to its ends, and nothing ever wraps.
+TEST(PrintfOracle, EndsOfEveryIntegerClass) {
+    const auto check = [](auto value, vxClassID classID) {
+        const ArrayPtr argument = makeRow(classID, {value});
+        const auto wide = static_cast<__int128>(value);
+        const bool fitsLong = wide <= std::numeric_limits<long>::max();
+        EXPECT_EQ(fileio_tests::print("%d", argument).text,
+                  fitsLong ? std::to_string(value) : formatted("%e", static_cast<double>(value)));
+        EXPECT_EQ(fileio_tests::print("%u", argument).text,
+                  value >= 0 ? std::to_string(value) : formatted("%e", static_cast<double>(value)));
+    };
+    const auto checkClass = [&check]<class T>(T, vxClassID classID) {
+        check(std::numeric_limits<T>::min(), classID);
+        check(std::numeric_limits<T>::max(), classID);
+        check(static_cast<T>(5), classID);
+    };
+    checkClass(std::int8_t(), vxINT8_CLASS);
+    checkClass(std::int16_t(), vxINT16_CLASS);
+    checkClass(std::int32_t(), vxINT32_CLASS);
+    checkClass(std::int64_t(), vxINT64_CLASS);
+    checkClass(std::uint8_t(), vxUINT8_CLASS);
+    checkClass(std::uint16_t(), vxUINT16_CLASS);
+    checkClass(std::uint32_t(), vxUINT32_CLASS);
+    checkClass(std::uint64_t(), vxUINT64_CLASS);
+}
+
+// With "#0" and a width, the digits of a bit pattern fill the width behind the prefix's own room.
+TEST(PrintfOracle, BitPatternsOfEveryFlag) {
+    const struct {
+        int line;
+        const char* format;
+        double value;
+        const char* text;
+    } rows[] = {
+        {__LINE__, "%bx", 1, "3ff0000000000000"},
+        {__LINE__, "%tx", 1, "3f800000"},
+        {__LINE__, "%bX", -1.5, "BFF8000000000000"},
+        {__LINE__, "%bo", 1, "0377600000000000000000"},
+        {__LINE__, "%bu", 1, "04607182418800017408"},
+        {__LINE__, "%to", 1, "07740000000"},
+        {__LINE__, "%tu", 1, "1065353216"},
+        {__LINE__, "%bx", std::numeric_limits<double>::infinity(), "7ff0000000000000"},
+        {__LINE__, "%tx", 0.1, "3dcccccd"},
+        {__LINE__, "%12tx", 1, "    3f800000"},
+        {__LINE__, "%-12tx|", 1, "3f800000    |"},
+        {__LINE__, "%012tx", 1, "00003f800000"},
+        {__LINE__, "%-012tx|", 1, "3f800000    |"},
+        {__LINE__, "%012.9tx", 1, "   03f800000"},
+        {__LINE__, "%#tx", 1, "0x3f800000"},
+        {__LINE__, "%#tX", 1, "0X3F800000"},
+        {__LINE__, "%#020bx", 1, "0x00003ff0000000000000"},
+        {__LINE__, "%#to", 1, "007740000000"},
+        {__LINE__, "%#.12to", 1, "007740000000"},
+        {__LINE__, "%#tu", 1, "1065353216"},
+    };
+    for (const auto& row : rows) {
+        EXPECT_EQ(fileio_tests::print(row.format, makeScalar(row.value)).text, row.text)
+            << "row of line " << row.line;
+    }
+}
+
+}  // namespace
