@@ -1,10 +1,8 @@
 #pragma once
 
+#include "fileio/errors/stored_exception.h"
 #include "fileio/host/arrays.h"
-#include "fileio/host/exception.h"
 #include "fileio/memory_operation_overloads.h"
-
-#include <exception>
 
 #include <boost/exception_ptr.hpp>
 
@@ -17,7 +15,7 @@ class FILEIO_API NumericAttr : public fiMemoryOperationOverloads {
 public:
     // `defaultError` is what Validate raises when no better error was set.
     template <class Err>
-    explicit NumericAttr(const Err& defaultError) : error(store(defaultError)) {}
+    explicit NumericAttr(const Err& defaultError) : error(detail::storedException(defaultError)) {}
     NumericAttr(const NumericAttr&) = default;
     NumericAttr& operator=(const NumericAttr&) = default;
     virtual ~NumericAttr();
@@ -28,7 +26,7 @@ public:
 
     template <class Err>
     void SetError(const Err& newError) {
-        error = store(newError);
+        error = detail::storedException(newError);
         valid = false;
     }
 
@@ -47,15 +45,6 @@ public:
 protected:
     bool valid = true;
     boost::exception_ptr error;
-
-    template <class Err>
-    static boost::exception_ptr store(const Err& id) {
-        try {
-            throw foundation::core::except::Exception<Err, std::exception>(id);
-        } catch (...) {
-            return boost::current_exception();
-        }
-    }
 };
 
 }  // namespace Orvandeil::FileIO
