@@ -17,12 +17,15 @@ inline constexpr std::size_t firstOutputBlockBytes = 1024;
 inline constexpr std::size_t numberScratchBytes = 8;
 // Pad characters written at once.
 inline constexpr std::size_t paddingBlockUnits = 3;
+// The largest chunk, in bytes, that a buffer opens beyond what it was asked for.
+inline constexpr std::size_t reservedChunkBytes = 16;
 #else
 inline constexpr std::size_t transferPieceBytes = 1048576;
 inline constexpr std::size_t converterPieceBytes = 0x3FFFFFFF;
 inline constexpr std::size_t firstOutputBlockBytes = 1024;
 inline constexpr std::size_t numberScratchBytes = 512;
 inline constexpr std::size_t paddingBlockUnits = 256;
+inline constexpr std::size_t reservedChunkBytes = 65536;
 #endif
 
 }  // namespace Orvandeil::FileIO::constants

@@ -20,19 +20,24 @@ public:
     // "KESTRA:legacy_two_part:badsize_vx".
     void Init(const vxArray* array);
 
-    // `array` is double. 0 on success, 1 on failure; `form` tells how the size was written: 1 a
-    // scalar, 2 a pair, 0 an empty array.
+    // `array` is real and numeric. 0 on success, 1 on failure; `form` tells how the size was
+    // written: 1 a scalar, 2 a pair, 0 an empty array or another shape.
     int ParseSize(const vxArray* array, int* form);
 
     // For kind 13 (a transfer without conversion) the size becomes a count of bytes in one row.
-    // Raises "KESTRA:legacy_two_part:p64bitsize" when that count does not fit 64 bits, or
-    // `elementSize` is 0. Other kinds change nothing.
+    // An infinite size stays infinite. Raises "KESTRA:legacy_two_part:p64bitsize", and changes
+    // nothing, when the count does not fit 64 bits or `elementSize` is 0. Other kinds change
+    // nothing.
     void Adjust(int kind, unsigned long elementSize);
 
     unsigned long m = 1;
     unsigned long n = 0;
     bool isMatrix = false;   // written as a pair
     bool isInfinite = true;  // to the end of the data
+
+private:
+    int parseScalar(double value);
+    int parsePair(double rows, double columns);
 };
 
 }  // namespace Orvandeil::FileIO

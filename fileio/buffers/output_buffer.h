@@ -55,7 +55,8 @@ public:
     void Clear();
 
     // Rollback takes back everything allocated since SetRollbackPoint. It serves to undo what was
-    // read one step too far, and leaves the mark where it is.
+    // read one step too far, and leaves the mark where it is. Without an Allocate since the mark
+    // was set it takes back everything there is.
     void SetRollbackPoint() { rollbackStart = nullptr; }
     void Rollback();
 
@@ -83,6 +84,16 @@ public:
 
 private:
     friend struct LayoutProbe;
+
+    std::size_t bytesOf(std::size_t elements) const;
+    bool fitsLastChunk(std::size_t n) const;
+    void makeRoomInLists();
+    void openChunk(std::size_t n);
+    void dropChunksFrom(std::size_t first);
+    void* keepConverted(void* end);
+    void* takeBlock(std::size_t elements);
+    char* joinChunks(std::size_t bytes);
+    void fillArray(vxArray* array, std::size_t elements);
 
     std::size_t minChunk;
     std::size_t maxChunk;

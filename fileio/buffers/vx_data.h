@@ -42,11 +42,12 @@ private:
     const void* elements;
 };
 
+template <>
+FILEIO_API std::u16string VxData::getIndexAs<std::u16string>(std::size_t index) const;
 extern template FILEIO_API double VxData::getIndexAs<double>(std::size_t) const;
 extern template FILEIO_API float VxData::getIndexAs<float>(std::size_t) const;
 extern template FILEIO_API long VxData::getIndexAs<long>(std::size_t) const;
 extern template FILEIO_API unsigned long VxData::getIndexAs<unsigned long>(std::size_t) const;
 extern template FILEIO_API char16_t VxData::getIndexAs<char16_t>(std::size_t) const;
-extern template FILEIO_API std::u16string VxData::getIndexAs<std::u16string>(std::size_t) const;
 
 }  // namespace Orvandeil::FileIO
