@@ -21,7 +21,7 @@ std::size_t product(const std::vector<std::size_t>& lengths, std::size_t from) {
 }
 
 std::vector<std::size_t> objectDimensions(const vxArray* object) {
-    const detail::HostArray size(vxDispatchCall("size", &object, 1));
+    const detail::OwnedArray size(vxDispatchCall("size", &object, 1));
     const bool usable = size && vxArrayClassID(size.get()) == vxDOUBLE_CLASS &&
                         vxArrayIsVector(size.get()) && !vxArrayIsScalar(size.get());
     if (!usable) vxErrMsgId(KESTRA::printf::invalidSizeResult(vxArrayClassName(object)));
