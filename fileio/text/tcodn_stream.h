@@ -38,7 +38,9 @@ public:
     std::string GetEncodingName();
 
     // Decode up to `n` units, or everything to the end of the data, and return the number of units
-    // produced. `bytesConsumed` (may be null) receives the bytes that they took.
+    // produced. `bytesConsumed` (may be null) receives the bytes that they took. Bytes that were
+    // read and not needed after all (only ill-formed text leaves any) are given back by Rewind. A
+    // converter that fails on more than 1 GiB at once throws ConversionSizeError.
     unsigned long GetNCodePoints(char16_t* out, unsigned long n, std::size_t* bytesConsumed);
     unsigned long GetNCodePoints(OutputBuffer& buffer, unsigned long n, std::size_t* bytesConsumed);
     // Returns only the units of the last round; the buffer's size tells the rest.
@@ -63,13 +65,32 @@ public:
     // PutString of `n` ASCII bytes; a byte above 0x7F writes nothing and returns 0.
     int PutASCIIString(const char* text, int n);
 
+protected:
+    // Derives latinFixed and utf16 from ICU's own name of the converter.
+    void SetEncodingSpecificFlags();
+
+    // Looks for the first byte that is no 7-bit ASCII, or is a NUL anywhere but at the end, and
+    // returns its index, clearing the flag; else 0.
+    unsigned long asciiCheck(const char* bytes, unsigned long count);
+
+    // Records an ICU failure as one of the codes -37 to -42; success and warnings leave the code.
+    void CheckStatus(UErrorCode status);
+
 private:
     friend struct LayoutProbe;
+    struct Undecoded;
+
+    void openConverter(const std::string& name);
+    Undecoded readUndecoded(unsigned long wanted);
+    unsigned long decode(Undecoded& bytes, char16_t* out, unsigned long room);
+    unsigned long convert(Undecoded& bytes, char16_t* out, unsigned long room, UConverter* from);
+    unsigned long decodeInto(OutputBuffer& buffer, std::size_t& room, std::size_t& bytesConsumed);
+    unsigned long encode(const char16_t* text, unsigned long n, UErrorCode& status);
 
     UConverter* converter = nullptr;
-    bool latinFixed = false;
-    bool utf16 = false;
-    bool asciiSoFar;
+    bool latinFixed = false;  // an encoding whose units are taken as they come
+    bool utf16 = false;       // output bypasses the converter
+    bool asciiSoFar;          // undecided, and only 7-bit ASCII so far
     std::string readBytes;
     std::u16string oneChar;
     std::string writeBytes;

@@ -1,0 +1,96 @@
+#include "fileio/text/tcodn_stream.h"
+
+#include "fileio/errors/code_list.h"
+#include "fileio/errors/identifiers.h"
+#include "fileio/host/messages.h"
+#include "fileio/host/text.h"
+
+#include <algorithm>
+#include <array>
+#include <clocale>
+#include <cstring>
+#include <strings.h>
+#include <utility>
+
+namespace Orvandeil::FileIO {
+namespace {
+
+// ICU's names of the encodings whose text holds no surrogates to filter.
+constexpr std::array latinFixedNames = {"ibm-5348_P100-1997", "ibm-943_P15A-2003", "ISO-8859-1",
+                                        "US-ASCII"};
+
+struct StatusCode {
+    UErrorCode status;
+    int code;
+};
+constexpr std::array statusCodes = {
+    StatusCode{U_INVALID_CHAR_FOUND, code::InvalidChar},
+    StatusCode{U_TRUNCATED_CHAR_FOUND, code::TruncatedChar},
+    StatusCode{U_ILLEGAL_CHAR_FOUND, code::IllegalChar},
+    StatusCode{U_INVALID_TABLE_FORMAT, code::InvalidTableFormat},
+    StatusCode{U_BUFFER_OVERFLOW_ERROR, code::BufferOverflow},
+};
+
+// The formatted numbers of the standard library need '.' as their decimal point. Setting a locale
+// is slow and touches the whole process, so it is asked for first.
+void useCNumericLocale() {
+    const char* current = std::setlocale(LC_NUMERIC, nullptr);
+    if (!current || std::strcmp(current, "C") != 0) std::setlocale(LC_NUMERIC, "C");
+}
+
+const char* nameOf(const UConverter* converter) {
+    UErrorCode status = U_ZERO_ERROR;
+    const char* name = ucnv_getName(converter, &status);
+    return U_SUCCESS(status) && name ? name : "";
+}
+
+bool sameName(const char* a, const char* b) {
+    return strcasecmp(a, b) == 0;
+}
+
+}  // namespace
+
+TcodnStream::TcodnStream(std::string encoding) : asciiSoFar(encoding.empty()) {
+    useCNumericLocale();
+    if (!encoding.empty()) openConverter(encoding);
+}
+
+TcodnStream::~TcodnStream() {
+    ucnv_close(converter);
+}
+
+void TcodnStream::openConverter(const std::string& name) {
+    UErrorCode status = U_ZERO_ERROR;
+    converter = ucnv_open(name.c_str(), &status);
+    if (U_FAILURE(status)) vxErrMsgId(KESTRA::iofun::InvalidEncoding(name));
+    SetEncodingSpecificFlags();
+}
+
+UConverter* TcodnStream::GetConv(unsigned long n) {
+    if (!converter) {
+        const std::string detected = DetectCharset(n);
+        openConverter(detected.empty() ? "UTF-8" : detected);
+    }
+    return converter;
+}
+
+std::string TcodnStream::GetEncodingName() {
+    return vxTextCanonicalEncodingName(nameOf(GetConv(0)));
+}
+
+void TcodnStream::SetEncodingSpecificFlags() {
+    const char* name = nameOf(converter);
+    latinFixed = std::any_of(latinFixedNames.begin(), latinFixedNames.end(),
+                             [name](const char* latin) { return sameName(name, latin); });
+    utf16 = sameName(name, "UTF-16");
+}
+
+void TcodnStream::CheckStatus(UErrorCode status) {
+    if (!U_FAILURE(status)) return;
+    const auto* found =
+        std::find_if(statusCodes.begin(), statusCodes.end(),
+                     [status](const StatusCode& row) { return row.status == status; });
+    errorCode = found == statusCodes.end() ? code::UnknownError : found->code;
+}
+
+}  // namespace Orvandeil::FileIO

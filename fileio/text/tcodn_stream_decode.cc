@@ -1,0 +1,204 @@
+#include "fileio/constants.h"
+#include "fileio/host/text.h"
+#include "fileio/text/conversion_size_error.h"
+#include "fileio/text/tcodn_stream.h"
+
+#include <algorithm>
+#include <utility>
+
+#include <unicode/utf16.h>
+
+namespace Orvandeil::FileIO {
+
+// What one read brought in and no unit has been made of yet; it lies in readBytes.
+struct TcodnStream::Undecoded {
+    const char* next = nullptr;
+    std::size_t count = 0;
+    std::size_t bytesRead = 0;
+    bool endOfData = false;
+    bool exhausted = false;  // the last round neither took a byte nor made a unit
+};
+
+namespace {
+
+constexpr unsigned long largestRead = 2147483647;
+constexpr std::size_t largestConversion = 0x3FFFFFFD;
+
+// Each pair becomes the one unit U+001A, each surrogate without its partner as well.
+unsigned long replacePairs(char16_t* units, unsigned long count) {
+    char16_t* const end =
+        std::remove_if(units, units + count, [](char16_t unit) { return U16_IS_TRAIL(unit); });
+    std::replace_if(
+        units, end, [](char16_t unit) { return U16_IS_LEAD(unit); }, u'\u001A');
+    return static_cast<unsigned long>(end - units);
+}
+
+// Takes the second half of a pair out of the converter, whose first half filled the target. A
+// reset would do so too, but also forget the byte order and the shift state.
+void dropHeldUnit(UConverter* converter) {
+    char16_t held;
+    char16_t* target = &held;
+    const char* nothing = "";
+    UErrorCode status = U_ZERO_ERROR;
+    ucnv_toUnicode(converter, &target, target + 1, &nothing, nothing, nullptr, false, &status);
+}
+
+}  // namespace
+
+unsigned long TcodnStream::asciiCheck(const char* bytes, unsigned long count) {
+    for (unsigned long i = 0; i < count; ++i) {
+        const auto byte = static_cast<unsigned char>(bytes[i]);
+        // A NUL that ends a read is let through on purpose.
+        if (byte < 0x80 && (byte != 0 || i + 1 == count)) continue;
+        asciiSoFar = false;
+        return i;
+    }
+    return 0;
+}
+
+// One read to the layers above; memory grows with what is really there.
+TcodnStream::Undecoded TcodnStream::readUndecoded(unsigned long wanted) {
+    wanted = std::min(wanted, largestRead);
+    unsigned long piece = 0;
+    unsigned long got = 0;
+    std::size_t total = 0;
+    do {
+        piece = std::min(wanted - total, constants::transferPieceBytes);
+        readBytes.resize(total + piece);
+        got = GetNElements(piece, readBytes.data() + total, 1);
+        total += got;
+    } while (got == piece && total < wanted);
+    readBytes.resize(total);
+    return {readBytes.data(), total, total, total == 0, false};
+}
+
+unsigned long TcodnStream::GetNCodePoints(char16_t* out, unsigned long n,
+                                          std::size_t* bytesConsumed) {
+    std::size_t unused = 0;
+    std::size_t& consumed = bytesConsumed ? *bytesConsumed : unused;
+    consumed = 0;
+    Undecoded bytes;
+    unsigned long produced = 0;
+    while (produced < n && !bytes.exhausted) {
+        if (bytes.count == 0) {
+            // Never more bytes than units are wanted: one-byte encodings read nothing too far.
+            bytes = readUndecoded(n - produced);
+            consumed += bytes.count;
+        }
+        produced += decode(bytes, out + produced, n - produced);
+    }
+    if (bytes.count != 0 && Rewind(bytes.count)) consumed -= bytes.count;
+    return produced;
+}
+
+unsigned long TcodnStream::decode(Undecoded& bytes, char16_t* out, unsigned long room) {
+    unsigned long leadingAscii = 0;
+    if (asciiSoFar) leadingAscii = asciiCheck(bytes.next, bytes.count);
+    if (!asciiSoFar) return convert(bytes, out, room, GetConv(leadingAscii));
+    std::copy_n(bytes.next, bytes.count, out);
+    bytes.exhausted = bytes.count == 0;
+    return std::exchange(bytes.count, 0);
+}
+
+unsigned long TcodnStream::convert(Undecoded& bytes, char16_t* out, unsigned long room,
+                                   UConverter* from) {
+    const char* source = bytes.next;
+    const char* const sourceEnd = source + std::min(bytes.count, constants::converterPieceBytes);
+    char16_t* target = out;
+    const char16_t* const targetEnd = out + std::min(room, constants::converterPieceBytes);
+    UErrorCode status = U_ZERO_ERROR;
+    ucnv_toUnicode(from, &target, targetEnd, &source, sourceEnd, nullptr, bytes.endOfData, &status);
+    // A full target is how a round ends, and no failure.
+    if (status == U_BUFFER_OVERFLOW_ERROR && target == targetEnd) status = U_ZERO_ERROR;
+    if (U_FAILURE(status) && bytes.bytesRead > largestConversion) throw ConversionSizeError();
+
+    bytes.exhausted = target == out && source == bytes.next;
+    bytes.count -= static_cast<std::size_t>(source - bytes.next);
+    bytes.next = source;
+    auto units = static_cast<unsigned long>(target - out);
+    if (units != 0 && U16_IS_LEAD(target[-1])) dropHeldUnit(from);
+    if (!latinFixed) units = replacePairs(out, units);
+    CheckStatus(status);
+    return units;
+}
+
+// Decodes up to `room` units (changed to what the buffer granted) into a new run of the buffer.
+unsigned long TcodnStream::decodeInto(OutputBuffer& buffer, std::size_t& room,
+                                      std::size_t& bytesConsumed) {
+    auto* const out = static_cast<char16_t*>(buffer.Allocate(room));
+    std::size_t bytes = 0;
+    const unsigned long units = GetNCodePoints(out, room, &bytes);
+    buffer.SetLastChunkSize(units);
+    bytesConsumed += bytes;
+    return units;
+}
+
+unsigned long TcodnStream::GetNCodePoints(OutputBuffer& buffer, unsigned long n,
+                                          std::size_t* bytesConsumed) {
+    std::size_t consumed = 0;
+    unsigned long total = 0;
+    std::size_t room = 0;
+    unsigned long units = 0;
+    while (total < n && units == room) {
+        room = std::min(n - total, constants::transferPieceBytes);
+        units = decodeInto(buffer, room, consumed);
+        total += units;
+    }
+    if (bytesConsumed) *bytesConsumed = consumed;
+    return total;
+}
+
+unsigned long TcodnStream::GetNCodePoints(OutputBuffer& buffer, std::size_t* bytesConsumed) {
+    std::size_t consumed = 0;
+    std::size_t room = 0;
+    unsigned long units = 0;
+    do {
+        room = buffer.SetCurrentCapacity(0, true);
+        units = decodeInto(buffer, room, consumed);
+    } while (units == room);
+    if (bytesConsumed) *bytesConsumed = consumed;
+    return units;
+}
+
+unsigned long TcodnStream::GetNCodePoints(std::u16string& text, unsigned long n,
+                                          std::size_t* bytesConsumed) {
+    std::size_t consumed = 0;
+    unsigned long total = 0;
+    do {
+        text.resize(total + std::min(n - total, constants::transferPieceBytes));
+        std::size_t bytes = 0;
+        total += GetNCodePoints(text.data() + total, text.size() - total, &bytes);
+        consumed += bytes;
+    } while (total == text.size() && total < n);
+    text.resize(total);
+    if (bytesConsumed) *bytesConsumed = consumed;
+    return total;
+}
+
+unsigned long TcodnStream::GetString(OutputBuffer& buffer, long width, bool noLimit) {
+    long count = 0;
+    while (noLimit || count < width) {
+        char16_t unit;
+        std::size_t bytes = 0;
+        if (GetNCodePoints(&unit, 1, &bytes) == 0) break;
+        if (!qzu_isbreakablespace(unit)) {
+            std::size_t room = 1;
+            *static_cast<char16_t*>(buffer.Allocate(room)) = unit;
+            ++count;
+        } else if (count != 0) {
+            Rewind(bytes);
+            break;
+        }
+    }
+    return static_cast<unsigned long>(count);
+}
+
+void TcodnStream::SkipWhiteSpace() {
+    std::size_t bytes = 0;
+    do {
+        if (GetNCodePoints(oneChar, 1, &bytes) == 0) return;
+    } while (qzu_isbreakablespace(oneChar.front()));
+    Rewind(bytes);
+}
+
+}  // namespace Orvandeil::FileIO
