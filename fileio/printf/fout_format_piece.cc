@@ -35,10 +35,9 @@ bool fitsInt(long number) {
     return number <= std::numeric_limits<int>::max();
 }
 
-// What printf makes of a field wider than an int can tell: nothing, and a failure.
-int printTooWide(TcodnStream* out) {
-    const char* const tooWide = "%2147483648d";
-    return out->printf(tooWide, 0);
+// What printf makes of a width that no int can pass: nothing, and a failure of its own.
+int printTooWide(TcodnStream* out, long width) {
+    return out->printf(('%' + std::to_string(width) + 'd').c_str(), 0);
 }
 
 void checkPrinted(TcodnStream* out, int result) {
@@ -127,7 +126,7 @@ int foutFormatPiece::printValue(TcodnStream* out, T value) const {
     if (!width.isFromArgument()) {
         return passPrecision ? out->printf(text, precisionPassed, value) : out->printf(text, value);
     }
-    if (!fitsInt(width.getEffective())) return printTooWide(out);
+    if (!fitsInt(width.getEffective())) return printTooWide(out, width.getEffective());
     const int widthPassed = static_cast<int>(width.getEffective());
     return passPrecision ? out->printf(text, widthPassed, precisionPassed, value)
                          : out->printf(text, widthPassed, value);
@@ -161,7 +160,7 @@ void foutFormatPiece::printField(TcodnStream* out, long fieldWidth, bool left,
                                  const char* text) const {
     const bool fits = fitsInt(fieldWidth);
     const int widthPassed = fits ? static_cast<int>(fieldWidth) : 0;
-    const int result = !fits  ? printTooWide(out)
+    const int result = !fits  ? printTooWide(out, fieldWidth)
                        : left ? out->printf("%-*s", widthPassed, text)
                               : out->printf("%*s", widthPassed, text);
     checkPrinted(out, result);

@@ -74,7 +74,7 @@ const ParserRow parserRows[] = {
     {__LINE__, "%.-f%.-0d", false, "%.f 7 p0:0@0; %.lld 1 p0:0@4; ", 1, 2},
     {__LINE__, "%.f%.0f", false, "%.f 7 p0:0@0; %.0f 7 p0:0@3; ", 1, 2},
     {__LINE__, "%hd%ld%i", false, "%lld 1/1@0; %lld 1/2@3; %lli 2@6; ", 1, 3},
-    {__LINE__, "%lld", false, "!-8", 1, 0},  // one modifier letter only
+    {__LINE__, "%lld", false, "!-8", 0, 0},  // one modifier letter only
     {__LINE__, "%bx%to%bu%bX", false, "%llx 5/4@0; %llo 3/3@3; %llu 4/4@6; %llX 5/4@9; ", 1, 4},
     {__LINE__, "%bd", false, "!-8", 1, 1},
     {__LINE__, "%ti", false, "!-8", 1, 1},

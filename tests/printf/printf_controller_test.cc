@@ -205,7 +205,8 @@ TEST(PrintfController, NamesWhatAnObjectDoesWrong) {
         ArrayPtr argument;
         const char* identifier;
     } failures[] = {
-        {__LINE__, "%d", makeObject("thing", {}), "KESTRA:printf:invalidSizeResult"},
+        {__LINE__, "%d", makeObject("thing", {{"size", returning([] { return ArrayPtr(); })}}),
+         "KESTRA:printf:invalidSizeResult"},
         {__LINE__, "%d", makeObject("thing", {{"size", returning([] { return makeScalar(1); })}}),
          "KESTRA:printf:invalidSizeResult"},
         {__LINE__, "%d", makeObject("thing", {{"size", returning([] { return chars("ab"); })}}),
