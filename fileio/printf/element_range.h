@@ -1,10 +1,9 @@
 #pragma once
 
+#include "fileio/buffers/convert_element.h"
 #include "fileio/buffers/vx_data.h"
 
 #include <cmath>
-#include <cstdint>
-#include <cstring>
 #include <limits>
 #include <type_traits>
 #include <utility>
@@ -24,40 +23,16 @@ bool isRepresentable(Source value) {
     }
 }
 
-template <class Source>
-Source loadElement(const VxData& data, std::size_t index) {
-    Source value;
-    std::memcpy(&value, static_cast<const char*>(data.getElements()) + index * sizeof value,
-                sizeof value);
-    return value;
-}
-
 // Whether an element of a numeric, char or logical array is, exactly, a value of Target. Char and
 // logical count as unsigned integers.
 template <class Target>
 bool isRepresentable(const VxData& data, std::size_t index) {
     switch (data.getClassID()) {
-        case vxDOUBLE_CLASS:
-            return isRepresentable<Target>(loadElement<double>(data, index));
-        case vxSINGLE_CLASS:
-            return isRepresentable<Target>(loadElement<float>(data, index));
-        case vxINT8_CLASS:
-            return isRepresentable<Target>(loadElement<std::int8_t>(data, index));
-        case vxINT16_CLASS:
-            return isRepresentable<Target>(loadElement<std::int16_t>(data, index));
-        case vxINT32_CLASS:
-            return isRepresentable<Target>(loadElement<std::int32_t>(data, index));
-        case vxINT64_CLASS:
-            return isRepresentable<Target>(loadElement<std::int64_t>(data, index));
-        case vxUINT32_CLASS:
-            return isRepresentable<Target>(loadElement<std::uint32_t>(data, index));
-        case vxUINT64_CLASS:
-            return isRepresentable<Target>(loadElement<std::uint64_t>(data, index));
-        case vxLOGICAL_CLASS:
-        case vxCHAR_CLASS:
-        case vxUINT8_CLASS:
-        case vxUINT16_CLASS:
-            return true;
+#define FILEIO_TEST_ELEMENT(classID, Type) \
+    case classID:                          \
+        return isRepresentable<Target>(toNumber(loadElement<Type>(data.getElements(), index)));
+        FILEIO_FOR_EACH_ELEMENT(FILEIO_TEST_ELEMENT)
+#undef FILEIO_TEST_ELEMENT
         default:
             return false;
     }
@@ -67,9 +42,9 @@ bool isRepresentable(const VxData& data, std::size_t index) {
 inline bool isNonFinite(const VxData& data, std::size_t index) {
     switch (data.getClassID()) {
         case vxDOUBLE_CLASS:
-            return !std::isfinite(loadElement<double>(data, index));
+            return !std::isfinite(loadElement<double>(data.getElements(), index));
         case vxSINGLE_CLASS:
-            return !std::isfinite(loadElement<float>(data, index));
+            return !std::isfinite(loadElement<float>(data.getElements(), index));
         default:
             return false;
     }
