@@ -27,8 +27,6 @@ public:
     int dataSizeType;
 
 private:
-    friend struct LayoutProbe;
-
     // A letter's index is its place minus 1. The blanks stand for indices that have no letter.
     static constexpr char m_FormatMap[9] = "nlb   as";
 

@@ -36,8 +36,6 @@ public:
     bool allowConversion = true;             // whether "=>" is accepted
 
 private:
-    friend struct LayoutProbe;
-
     bool initFileType(const char* rest);
     bool initSource(const char* rest, bool shorthand);
     bool initTarget(const char* rest);
