@@ -1,0 +1,65 @@
+#include "cli/format_place.h"
+
+#include "fileio/host/text.h"
+#include "fileio/printf/fout_format_piece.h"
+#include "fileio/printf/print_format_parser.h"
+
+#include <algorithm>
+
+namespace cli {
+
+using Orvandeil::FileIO::foutFormatPiece;
+using Orvandeil::FileIO::PrintFormatParser;
+
+namespace {
+
+// The conversion at `start`, with the character that spoils it where there is one.
+std::u16string_view conversionAt(std::u16string_view format, std::size_t start) {
+    constexpr std::u16string_view inner = u"0123456789$-+ #.*hlbt";
+    std::size_t end = std::min(format.find_first_not_of(inner, start + 1), format.size());
+    if (end < format.size()) ++end;
+    if (end < format.size() && (format[end] & 0xFC00) == 0xDC00) ++end;
+    return format.substr(start, end - start);
+}
+
+std::string placeAt(std::u16string_view format, std::size_t start) {
+    if (start >= format.size()) return {};
+    const auto isTrailing = [](char16_t unit) { return (unit & 0xFC00) == 0xDC00; };
+    const auto before = format.substr(0, start);
+    const auto column = 1 + before.size() -
+                        static_cast<std::size_t>(std::ranges::count_if(before, isTrailing));
+    const std::u16string_view text = conversionAt(format, start);
+    return '"' + vxTextToNarrow(text.data(), text.size()) + "\", column " +
+           std::to_string(column) + " of the format";
+}
+
+// Where the text behind a piece begins; a literal in front of a "%" knows only that "%".
+std::size_t endOf(std::u16string_view format, const foutFormatPiece& piece) {
+    const std::size_t position = piece.getFormatPosition();
+    if (piece.getConversion() != Orvandeil::FileIO::NoConversion) {
+        return format.find(u'%', position + 1);
+    }
+    return piece.getLiteralText() == u"%" ? position + 2 : position;
+}
+
+}  // namespace
+
+std::string malformedPlace(const std::u16string& format) {
+    PrintFormatParser parser(format, false);
+    std::size_t end = format.find(u'%');
+    try {
+        while (const foutFormatPiece* piece = parser.getNextPrintFormatPiece())
+            end = endOf(format, *piece);
+    } catch (int) {
+        return placeAt(format, end);
+    }
+    return {};
+}
+
+std::string piecePlace(std::u16string_view format, const foutFormatPiece* piece) {
+    const bool isConversion =
+        piece != nullptr && piece->getConversion() != Orvandeil::FileIO::NoConversion;
+    return isConversion ? placeAt(format, piece->getFormatPosition()) : std::string();
+}
+
+}  // namespace cli

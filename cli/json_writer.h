@@ -1,0 +1,57 @@
+#pragma once
+
+#include "cli/number_text.h"
+#include "fileio/host/arrays.h"
+
+#include <concepts>
+#include <string_view>
+
+#include <rapidjson/stringbuffer.h>
+#include <rapidjson/writer.h>
+
+namespace cli {
+
+// One JSON object, written key by key into memory. It is open from the beginning.
+class JsonWriter {
+public:
+    JsonWriter() { writer.StartObject(); }
+    JsonWriter(const JsonWriter&) = delete;
+    JsonWriter& operator=(const JsonWriter&) = delete;
+
+    JsonWriter& key(std::string_view name);
+
+    // Numbers are exact; not-a-number and the infinities become the strings "NaN", "Inf", "-Inf".
+    template <class T>
+        requires(std::integral<T> || std::floating_point<T>)
+    void value(T number) {
+        numberText(NumberText(number));
+    }
+    void value(bool truth) { writer.Bool(truth); }
+    // UTF-8.
+    void value(std::string_view text);
+    void value(const char* text) { value(std::string_view(text)); }
+    // An unpaired surrogate becomes U+FFFD.
+    void value(std::u16string_view text);
+
+    void startList() { writer.StartArray(); }
+    void endList() { writer.EndArray(); }
+    void startObject() { writer.StartObject(); }
+    void endObject() { writer.EndObject(); }
+
+    // The keys `class`, `size` and `data` (column-major), and `text` for char data. The elements
+    // of a string array are texts, missing ones null.
+    void arrayKeys(const vxArray& array);
+
+    // Closes the object and gives its text, one line with its end.
+    std::string_view finish();
+
+private:
+    void numberText(const NumberText& number);
+    void data(const vxArray& array);
+    void stringData(const vxArray& array);
+
+    rapidjson::StringBuffer buffer;
+    rapidjson::Writer<rapidjson::StringBuffer> writer{buffer};
+};
+
+}  // namespace cli

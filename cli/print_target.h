@@ -1,0 +1,25 @@
+#pragma once
+
+#include "cli/command_line.h"
+#include "cli/report.h"
+#include "fileio/text/tcodn_stream.h"
+
+#include <memory>
+
+namespace cli {
+
+// Where formatted output goes: a file, the console, or the JSON object.
+class PrintTarget {
+public:
+    virtual ~PrintTarget() = default;
+
+    virtual Orvandeil::FileIO::TcodnStream& stream() = 0;
+    // Delivers everything that was written to the stream. 0, or the code of the failure.
+    virtual int close() = 0;
+};
+
+// By the options `output`, `mode`, `encoding` and `json`. A file that cannot be opened for writing
+// throws CodeError.
+std::unique_ptr<PrintTarget> openPrintTarget(const CommandLine& line, Report& report);
+
+}  // namespace cli
