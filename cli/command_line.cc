@@ -6,9 +6,8 @@
 #include <algorithm>
 #include <array>
 #include <cctype>
-#include <string>
-
 #include <getopt.h>
+#include <string>
 
 namespace cli {
 namespace {
@@ -32,9 +31,8 @@ bool isOption(std::span<const Option> options, std::string_view argument) {
 std::vector<option> longOptions(std::span<const Option> options) {
     std::vector<option> table;
     for (std::size_t i = 0; i < options.size(); ++i) {
-        table.push_back({options[i].name,
-                         options[i].valueName ? required_argument : no_argument, nullptr,
-                         firstLongValue + static_cast<int>(i)});
+        table.push_back({options[i].name, options[i].valueName ? required_argument : no_argument,
+                         nullptr, firstLongValue + static_cast<int>(i)});
     }
     table.push_back({nullptr, 0, nullptr, 0});
     return table;
@@ -94,9 +92,9 @@ std::size_t CommandLine::readOption(std::span<const Option> options,
                                  arguments.size() > 1 ? arguments[1] : nullptr, nullptr};
     optind = 0;  // starts getopt_long afresh
     opterr = 0;
-    const int found = getopt_long(arguments.size() > 1 ? 3 : 2, pair.data(),
-                                  shortOptions(options).c_str(), longOptions(options).data(),
-                                  nullptr);
+    const int found =
+        getopt_long(arguments.size() > 1 ? 3 : 2, pair.data(), shortOptions(options).c_str(),
+                    longOptions(options).data(), nullptr);
     if (found == ':') {
         throw UsageError("option \"" + std::string(arguments[0]) + "\" needs a value");
     }
@@ -107,9 +105,8 @@ std::size_t CommandLine::readOption(std::span<const Option> options,
 }
 
 std::optional<std::string_view> CommandLine::value(std::string_view name) const {
-    const auto last = std::find_if(given.rbegin(), given.rend(), [name](const Given& one) {
-        return one.option->name == name;
-    });
+    const auto last = std::find_if(given.rbegin(), given.rend(),
+                                   [name](const Given& one) { return one.option->name == name; });
     if (last == given.rend()) return std::nullopt;
     return last->value;
 }

@@ -64,7 +64,8 @@ void runConvert(const CommandLine& line, Report& report) {
 }
 
 constexpr char details[] =
-    "CLASS is logical, char, int8 to int64, uint8 to uint64, single, double or string. Numbers are\n"
+    "CLASS is logical, char, int8 to int64, uint8 to uint64, single, double or string. Numbers "
+    "are\n"
     "rounded, halves away from zero, and saturate; NaN becomes 0 in an integer class. Of complex\n"
     "values the real part is taken. `fileio --help` tells how a VALUE is written.\n";
 

@@ -37,7 +37,8 @@ Decimal readDecimal(std::string_view number) {
         const long written = std::strtol(exponent.c_str(), nullptr, 10);
         decimal.scale += std::clamp(written, -largestExponent, largestExponent);
     }
-    const std::size_t zeros = std::min(decimal.digits.find_first_not_of('0'), decimal.digits.size());
+    const std::size_t zeros =
+        std::min(decimal.digits.find_first_not_of('0'), decimal.digits.size());
     decimal.digits.erase(0, zeros);
     decimal.scale -= static_cast<long>(zeros);
     return decimal;

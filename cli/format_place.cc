@@ -13,6 +13,10 @@ using Orvandeil::FileIO::PrintFormatParser;
 
 namespace {
 
+std::string narrowed(std::u16string_view text) {
+    return vxTextToNarrow(text.data(), text.size());
+}
+
 // The conversion at `start`, with the character that spoils it where there is one.
 std::u16string_view conversionAt(std::u16string_view format, std::size_t start) {
     constexpr std::u16string_view inner = u"0123456789$-+ #.*hlbt";
@@ -26,11 +30,10 @@ std::string placeAt(std::u16string_view format, std::size_t start) {
     if (start >= format.size()) return {};
     const auto isTrailing = [](char16_t unit) { return (unit & 0xFC00) == 0xDC00; };
     const auto before = format.substr(0, start);
-    const auto column = 1 + before.size() -
-                        static_cast<std::size_t>(std::ranges::count_if(before, isTrailing));
-    const std::u16string_view text = conversionAt(format, start);
-    return '"' + vxTextToNarrow(text.data(), text.size()) + "\", column " +
-           std::to_string(column) + " of the format";
+    const auto column =
+        1 + before.size() - static_cast<std::size_t>(std::ranges::count_if(before, isTrailing));
+    return '"' + narrowed(conversionAt(format, start)) + "\", column " + std::to_string(column) +
+           " of the format";
 }
 
 // Where the text behind a piece begins; a literal in front of a "%" knows only that "%".
@@ -54,6 +57,10 @@ std::string malformedPlace(const std::u16string& format) {
         return placeAt(format, end);
     }
     return {};
+}
+
+std::string pieceText(std::u16string_view format, const foutFormatPiece& piece) {
+    return narrowed(conversionAt(format, piece.getFormatPosition()));
 }
 
 std::string piecePlace(std::u16string_view format, const foutFormatPiece* piece) {

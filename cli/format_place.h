@@ -9,14 +9,16 @@ class foutFormatPiece;
 
 namespace cli {
 
-// Both give `"%zb", column 2 of the format`, counted in characters from 1, for a format whose
+// Places read `"%zb", column 2 of the format`, counted in characters from 1, for a format whose
 // escapes are converted.
 
 // The first malformed conversion of a format that records an error.
 std::string malformedPlace(const std::u16string& format);
 
+// The conversion of the format that a piece stands for, as it is written.
+std::string pieceText(std::u16string_view format, const Orvandeil::FileIO::foutFormatPiece& piece);
+
 // A piece of the format; empty for a literal one, and for null.
-std::string piecePlace(std::u16string_view format,
-                       const Orvandeil::FileIO::foutFormatPiece* piece);
+std::string piecePlace(std::u16string_view format, const Orvandeil::FileIO::foutFormatPiece* piece);
 
 }  // namespace cli

@@ -4,6 +4,7 @@
 #include "fileio/host/arrays.h"
 
 #include <concepts>
+#include <string>
 #include <string_view>
 
 #include <rapidjson/stringbuffer.h>
@@ -22,8 +23,7 @@ public:
 
     // Numbers are exact; not-a-number and the infinities become the strings "NaN", "Inf", "-Inf".
     template <class T>
-        requires(std::integral<T> || std::floating_point<T>)
-    void value(T number) {
+    requires(std::integral<T> || std::floating_point<T>) void value(T number) {
         numberText(NumberText(number));
     }
     void value(bool truth) { writer.Bool(truth); }
@@ -32,6 +32,8 @@ public:
     void value(const char* text) { value(std::string_view(text)); }
     // An unpaired surrogate becomes U+FFFD.
     void value(std::u16string_view text);
+    void value(const std::string& text) { value(std::string_view(text)); }
+    void value(const std::u16string& text) { value(std::u16string_view(text)); }
 
     void startList() { writer.StartArray(); }
     void endList() { writer.EndArray(); }

@@ -94,10 +94,9 @@ public:
         const WrittenBytes bytes(text);
         UConverter* const converter = text.GetConv(0);
         report.key("bytes", bytes.view().size());
-        report.key("hex", std::string_view(hexadecimal(bytes.view())));
-        report.key("text", holdsUnits(converter) ? bytes.units()
-                                                 : std::u16string_view(
-                                                       decoded(bytes.view(), converter)));
+        report.key("hex", hexadecimal(bytes.view()));
+        report.key("text", holdsUnits(converter) ? std::u16string(bytes.units())
+                                                 : decoded(bytes.view(), converter));
         return 0;
     }
 

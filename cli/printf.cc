@@ -90,12 +90,14 @@ constexpr Option options[] = {
 };
 
 constexpr char details[] =
-    "FORMAT is used again as long as data remain; running out of data ends the output. Conversions:\n"
+    "FORMAT is used again as long as data remain; running out of data ends the output. "
+    "Conversions:\n"
     "  %d %i  whole numbers     %o %u %x %X  the same unsigned, octal or hexadecimal\n"
     "  %e %f %g  (%E %G)        exponent form, fixed point, the shorter of both\n"
     "  %s %c  text, characters  %bx %tx  the bits of a double, of a single (also o, u, X)\n"
     "Flags - + blank # 0, width and .precision stand before the letter; `*` takes them from an\n"
-    "argument. %2$d names its argument by number. Escapes: \\n \\t \\r \\a \\b \\f \\v \\\\ \\' \\\" \\? \\101 \\x41.\n"
+    "argument. %2$d names its argument by number. Escapes: \\n \\t \\r \\a \\b \\f \\v \\\\ \\' "
+    "\\\" \\? \\101 \\x41.\n"
     "`fileio --help` tells how a VALUE is written.\n";
 
 }  // namespace

@@ -19,9 +19,9 @@ using embedded::ArrayPtr;
 
 namespace {
 
-constexpr std::array classes = {
-    vxLOGICAL_CLASS, vxCHAR_CLASS,   vxINT8_CLASS,   vxINT16_CLASS,  vxINT32_CLASS,  vxINT64_CLASS,
-    vxUINT8_CLASS,   vxUINT16_CLASS, vxUINT32_CLASS, vxUINT64_CLASS, vxSINGLE_CLASS, vxDOUBLE_CLASS};
+constexpr std::array classes = {vxLOGICAL_CLASS, vxCHAR_CLASS,   vxINT8_CLASS,   vxINT16_CLASS,
+                                vxINT32_CLASS,   vxINT64_CLASS,  vxUINT8_CLASS,  vxUINT16_CLASS,
+                                vxUINT32_CLASS,  vxUINT64_CLASS, vxSINGLE_CLASS, vxDOUBLE_CLASS};
 
 std::u16string wide(std::string_view text) {
     return vxTextFromNarrow(text.data(), text.size());
@@ -29,9 +29,11 @@ std::u16string wide(std::string_view text) {
 
 // Counted in characters from 1.
 std::size_t columnOf(std::string_view text, std::size_t place) {
-    const auto startsCharacter = [](char c) { return (static_cast<unsigned char>(c) & 0xC0) != 0x80; };
-    return 1 + static_cast<std::size_t>(
-                   std::ranges::count_if(text.substr(0, place), startsCharacter));
+    const auto startsCharacter = [](char c) {
+        return (static_cast<unsigned char>(c) & 0xC0) != 0x80;
+    };
+    return 1 +
+           static_cast<std::size_t>(std::ranges::count_if(text.substr(0, place), startsCharacter));
 }
 
 [[noreturn]] void refuse(std::string_view argument, std::size_t place, const std::string& reason) {

@@ -3,8 +3,8 @@
 #include "embedded/services/array.h"
 
 #include <optional>
-#include <vector>
 #include <string_view>
+#include <vector>
 
 namespace cli {
 

@@ -1,0 +1,85 @@
+#include "tests/cli/transcript.h"
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <stdexcept>
+
+#include <sys/wait.h>
+
+namespace transcript {
+namespace {
+
+namespace fs = std::filesystem;
+
+// Removed with everything in it.
+class Directory {
+public:
+    Directory() {
+        std::string name = fs::temp_directory_path() / "fileio-cli-XXXXXX";
+        if (mkdtemp(name.data()) == nullptr) throw std::runtime_error("no temporary directory");
+        path = name;
+    }
+    ~Directory() { fs::remove_all(path); }
+    Directory(const Directory&) = delete;
+    Directory& operator=(const Directory&) = delete;
+
+    fs::path path;
+};
+
+std::string contents(const fs::path& path) {
+    std::ifstream in(path, std::ios::binary);
+    std::ostringstream text;
+    text << in.rdbuf();
+    return text.str();
+}
+
+std::string prefixedLines(const std::string& text, const std::string& prefix) {
+    std::string lines;
+    std::istringstream in(text);
+    for (std::string line; std::getline(in, line);)
+        lines += prefix + line + '\n';
+    return lines;
+}
+
+}  // namespace
+
+std::vector<Case> read(const std::string& path) {
+    std::vector<Case> cases;
+    std::ifstream in(path);
+    if (!in) throw std::runtime_error("cannot read " + path);
+    bool inside = !path.ends_with(".md");
+    const bool isMarkdown = !inside;
+    int number = 0;
+    for (std::string line; std::getline(in, line);) {
+        ++number;
+        if (isMarkdown && line.starts_with("```")) {
+            inside = line == "```console";
+        } else if (inside && line.starts_with("$ ")) {
+            cases.push_back({path, number, line.substr(2), ""});
+        } else if (inside && !cases.empty() && !line.starts_with("# ")) {
+            cases.back().expected += line + '\n';
+        }
+    }
+    return cases;
+}
+
+std::string run(const std::string& command, const std::string& program) {
+    const Directory home;
+    const Directory captured;
+    fs::create_directory(home.path / "bin");
+    fs::create_symlink(program, home.path / "bin/fileio");
+    std::ofstream(captured.path / "script")
+        << "exec >" << captured.path << "/out 2>" << captured.path << "/err\n"
+        << "cd " << home.path << "\nPATH=\"$PWD/bin:$PATH\"\n"
+        << command << '\n';
+    const int status = std::system(("sh " + (captured.path / "script").string()).c_str());
+    std::string seen = prefixedLines(contents(captured.path / "out"), "");
+    seen += prefixedLines(contents(captured.path / "err"), "! ");
+    const int exitStatus = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
+    if (exitStatus != 0) seen += '[' + std::to_string(exitStatus) + "]\n";
+    return seen;
+}
+
+}  // namespace transcript
