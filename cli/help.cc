@@ -37,7 +37,9 @@ A VALUE is written as
   complex:[1+2i 3]             complex doubles
   'any text'                   a char row
   string:any text              a string; string:<missing> is a missing one
+  @FILE.npy                    the array in a NumPy file
 and anything else is a char row of the text itself.
+An operand that begins with -- and a letter needs a -- of its own in front of it.
 )";
 
 }  // namespace

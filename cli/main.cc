@@ -4,6 +4,7 @@
 #include "cli/usage_error.h"
 #include "cli/verb.h"
 #include "fileio/errors/code_list.h"
+#include "fileio/text/conversion_size_error.h"
 
 #include <exception>
 #include <new>
@@ -50,6 +51,10 @@ void runReporting(const Verb& verb, const CommandLine& line, Report& report) {
         report.fail(code::NoMemory);
     } catch (const std::length_error&) {
         report.fail(code::NoMemory);
+    } catch (const Orvandeil::FileIO::ConversionSizeError& error) {
+        report.fail(code::SizeTooBig, error.what());
+    } catch (const std::exception& error) {
+        report.fail(code::InternalError, error.what());
     }
 }
 

@@ -3,6 +3,7 @@
 #include "cli/element_reader.h"
 #include "cli/usage_error.h"
 #include "cli/value_literal.h"
+#include "embedded/npy/npy_file.h"
 #include "embedded/services/element_types.h"
 #include "fileio/host/text.h"
 
@@ -45,8 +46,8 @@ std::size_t columnOf(std::string_view text, std::size_t place) {
                              const Literal& literal) {
     const std::size_t length = literal.elements.size() - literal.rows * literal.columns;
     refuse(argument, prefix + literal.place,
-           "row " + std::to_string(literal.rows + 1) + " has " + std::to_string(length) +
-               " elements, the rows before it have " + std::to_string(literal.columns));
+           "row " + std::to_string(literal.rows + 1) + " has length " + std::to_string(length) +
+               ", not " + std::to_string(literal.columns) + " as the rows before it");
 }
 
 // Calls store(index, element) with the column-major index of every element.
@@ -119,6 +120,12 @@ ArrayPtr readString(std::string_view text) {
     return embedded::makeString(wide(text));
 }
 
+bool isNumpyFile(std::string_view argument) {
+    constexpr std::string_view ending = ".npy";
+    return argument.size() > ending.size() + 1 && argument.starts_with('@') &&
+           argument.ends_with(ending);
+}
+
 bool isQuoted(std::string_view argument) {
     return argument.size() >= 2 && argument.starts_with('\'') && argument.ends_with('\'');
 }
@@ -149,6 +156,7 @@ ArrayPtr readValue(std::string_view argument) {
     if (isQuoted(argument)) {
         return embedded::makeChars(wide(argument.substr(1, argument.size() - 2)));
     }
+    if (isNumpyFile(argument)) return embedded::npyRead(std::string(argument.substr(1)));
     const std::size_t prefix = argument.find(':') + 1;  // 0 when there is none
     if (prefix > 0) {
         const std::string_view name = argument.substr(0, prefix - 1);

@@ -21,10 +21,11 @@ std::vector<std::string_view> elementClassNames();
 //   complex:[1+2i 3]            complex doubles
 //   'any text'                  a char row
 //   string:any text             a string; string:<missing> a missing one
+//   @FILE.npy                   the array in a NumPy file
 // and anything else is a char row of the text itself. Malformed UTF-8 is substituted.
 //
 // Throws UsageError, naming the column, for a matrix whose rows differ in length and for a prefix
-// that is not followed by a number or matrix.
+// that is not followed by a number or matrix; errors of a file are the reader's.
 Orvandeil::FileIO::embedded::ArrayPtr readValue(std::string_view argument);
 
 }  // namespace cli
