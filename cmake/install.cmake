@@ -2,7 +2,7 @@
 # a package that find_package(fileio) finds.
 include(CMakePackageConfigHelpers)
 
-install(TARGETS fileio EXPORT fileioTargets)
+install(TARGETS fileio fileio_library EXPORT fileioTargets)
 install(DIRECTORY ${PROJECT_SOURCE_DIR}/fileio DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}
     FILES_MATCHING PATTERN *.h)
 if(FILEIO_HOST STREQUAL "embedded")
