@@ -17,11 +17,12 @@ JsonWriter& JsonWriter::key(std::string_view name) {
 }
 
 void JsonWriter::value(std::string_view text) {
-    writer.String(text.data(), static_cast<rapidjson::SizeType>(text.size()));
+    value(vxTextFromNarrow(text.data(), text.size()));
 }
 
 void JsonWriter::value(std::u16string_view text) {
-    value(vxTextToNarrow(text.data(), text.size()));
+    const std::string utf8 = vxTextToNarrow(text.data(), text.size());
+    writer.String(utf8.data(), static_cast<rapidjson::SizeType>(utf8.size()));
 }
 
 void JsonWriter::numberText(const NumberText& number) {

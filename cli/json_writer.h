@@ -27,7 +27,7 @@ public:
         numberText(NumberText(number));
     }
     void value(bool truth) { writer.Bool(truth); }
-    // UTF-8.
+    // UTF-8; malformed bytes become U+FFFD, so that the object stays valid.
     void value(std::string_view text);
     void value(const char* text) { value(std::string_view(text)); }
     // An unpaired surrogate becomes U+FFFD.

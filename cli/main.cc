@@ -43,6 +43,8 @@ void runReporting(const Verb& verb, const CommandLine& line, Report& report) {
     namespace code = Orvandeil::FileIO::code;
     try {
         verb.run(line, report);
+    } catch (const UsageError&) {
+        throw;
     } catch (const CodeError& error) {
         report.fail(error.code, error.what());
     } catch (const IMsgIDException& error) {

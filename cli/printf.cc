@@ -13,6 +13,7 @@
 
 namespace cli {
 
+using foundation::core::except::IMsgIDException;
 using Orvandeil::FileIO::printfController;
 using Orvandeil::FileIO::embedded::ArrayPtr;
 namespace code = Orvandeil::FileIO::code;
@@ -45,13 +46,19 @@ std::string failurePlace(const std::u16string& format, const printfController& c
 }
 
 // The data running out is the ordinary end of a format that is used again and again.
-void tellResult(bool complete, const std::u16string& format, const printfController& controller,
-                Report& report) {
-    if (complete) return;
+void tellFailure(const std::u16string& format, const printfController& controller, Report& report) {
     if (controller.getErrorCode() == code::NotEnoughArgs) {
         report.note(code::NotEnoughArgs);
     } else {
         report.fail(controller.getErrorCode(), failurePlace(format, controller));
+    }
+}
+
+void tellRaised(const std::exception_ptr& raised, const std::string& place, Report& report) {
+    try {
+        std::rethrow_exception(raised);
+    } catch (const IMsgIDException& error) {
+        report.fail(error, place);
     }
 }
 
@@ -71,13 +78,16 @@ void runPrintf(const CommandLine& line, Report& report) {
     std::exception_ptr raised;
     try {
         complete = controller.doPrintf();
-    } catch (...) {
+    } catch (const IMsgIDException&) {
         raised = std::current_exception();
     }
     // Whatever happened, what was written before it stays written.
     const int closeFailure = target->close();
-    if (raised) std::rethrow_exception(raised);
-    tellResult(complete, format, controller, report);
+    if (raised) {
+        tellRaised(raised, piecePlace(format, controller.getCurrentPiece()), report);
+    } else if (!complete) {
+        tellFailure(format, controller, report);
+    }
     if (closeFailure != 0) report.fail(closeFailure, line.valueOr("output", ""));
 }
 

@@ -41,10 +41,10 @@ void Report::fail(int failure, std::string_view place) {
     tell(describeCode(failure).message, place);
 }
 
-void Report::fail(const IMsgIDException& error) {
+void Report::fail(const IMsgIDException& error, std::string_view place) {
     failed = true;
     identifier = error.GetID();
-    tell(error.what(), {});
+    tell(error.what(), place);
 }
 
 void Report::note(int status) {

@@ -36,7 +36,7 @@ public:
     // The call failed with a numeric code; `place` says where in the user's text (may be empty).
     void fail(int code, std::string_view place = {});
     // The call failed with an identifier that has no code.
-    void fail(const foundation::core::except::IMsgIDException& error);
+    void fail(const foundation::core::except::IMsgIDException& error, std::string_view place = {});
     // A code that ended the call without being an error.
     void note(int code);
     // The identifier that is the answer itself.

@@ -1,5 +1,7 @@
 #include "tests/cli/transcript.h"
 
+#include <cstdio>
+#include <cstdlib>
 #include <filesystem>
 
 #include <gtest/gtest.h>
@@ -44,6 +46,10 @@ int main(int argc, char** argv) {
         for (const transcript::Case& example : transcript::read(argv[i])) {
             if (isProgramCommand(example)) registerCase(example, argv[1]);
         }
+    }
+    if (argc < 3) {
+        std::fprintf(stderr, "usage: %s PROGRAM TRANSCRIPT...\n", argv[0]);
+        return EXIT_FAILURE;
     }
     return RUN_ALL_TESTS();
 }

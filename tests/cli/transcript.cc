@@ -43,6 +43,13 @@ std::string prefixedLines(const std::string& text, const std::string& prefix) {
     return lines;
 }
 
+// Blank lines at the end separate one command from the next.
+std::string withoutBlankEnd(std::string text) {
+    while (text.ends_with("\n\n") || text == "\n")
+        text.pop_back();
+    return text;
+}
+
 }  // namespace
 
 std::vector<Case> read(const std::string& path) {
@@ -62,6 +69,9 @@ std::vector<Case> read(const std::string& path) {
             cases.back().expected += line + '\n';
         }
     }
+    if (cases.empty() && !isMarkdown) throw std::runtime_error("no command in " + path);
+    for (Case& example : cases)
+        example.expected = withoutBlankEnd(example.expected);
     return cases;
 }
 
@@ -79,7 +89,7 @@ std::string run(const std::string& command, const std::string& program) {
     seen += prefixedLines(contents(captured.path / "err"), "! ");
     const int exitStatus = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
     if (exitStatus != 0) seen += '[' + std::to_string(exitStatus) + "]\n";
-    return seen;
+    return withoutBlankEnd(seen);
 }
 
 }  // namespace transcript

@@ -13,7 +13,8 @@
 //
 // Standard output stands below the command, standard error behind "! ", an exit status other than
 // 0 in brackets. A line "#" and a blank begins a remark. A last line of output without an end is
-// given one. In Markdown, the same stands between ```console fences.
+// given one; blank lines at the end do not count. In Markdown, the same stands between ```console
+// fences.
 namespace transcript {
 
 struct Case {
