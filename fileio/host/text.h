@@ -5,6 +5,8 @@
 #include <cstddef>
 #include <string>
 
+struct vxConsoleSink;
+
 // Text services of the host.
 
 // Whether a line may break at this code unit: the blanks between words, line breaks included, but
@@ -23,6 +25,17 @@ FILEIO_API bool vxTextWidenAscii(const char* text, std::size_t count, char16_t* 
 
 // The canonical name that the host uses for the encoding a converter calls `name`.
 FILEIO_API std::string vxTextCanonicalEncodingName(const char* name);
+
+// The name under which the host itself knows an encoding, whatever alias it is given.
+FILEIO_API std::string vxTextStandardEncodingName(const char* name);
+
+// Whether the host can convert the encoding of that standard name.
+FILEIO_API bool vxTextEncodingIsSupported(const char* standardName);
+
+// The name of the character set that `count` bytes of the file seem to be written in, "UTF-8" when
+// there is nothing to tell. What it has to say to the user goes to `console`.
+FILEIO_API std::string vxTextDetectCharset(const char* bytes, std::size_t count,
+                                           vxConsoleSink& console, const std::u16string& fileName);
 
 // Reads one number by the host's number syntax from the start of [text, text + count), without
 // regard to any locale, and stores the bytes consumed (0: no number there).
