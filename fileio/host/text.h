@@ -26,11 +26,8 @@ FILEIO_API bool vxTextWidenAscii(const char* text, std::size_t count, char16_t* 
 // The canonical name that the host uses for the encoding a converter calls `name`.
 FILEIO_API std::string vxTextCanonicalEncodingName(const char* name);
 
-// The name under which the host itself knows an encoding, whatever alias it is given.
-FILEIO_API std::string vxTextStandardEncodingName(const char* name);
-
-// Whether the host can convert the encoding of that standard name.
-FILEIO_API bool vxTextEncodingIsSupported(const char* standardName);
+// Whether the host can convert the encoding of that canonical name.
+FILEIO_API bool vxTextEncodingIsSupported(const char* canonicalName);
 
 // The name of the character set that `count` bytes of the file seem to be written in, "UTF-8" when
 // there is nothing to tell. What it has to say to the user goes to `console`.

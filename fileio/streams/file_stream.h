@@ -5,6 +5,7 @@
 #include "fileio/text/tcodn_stream.h"
 
 #include <cstdarg>
+#include <cstddef>
 #include <cstdio>
 #include <memory>
 #include <string>
@@ -112,6 +113,13 @@ protected:
 
 private:
     friend struct LayoutProbe;
+
+    unsigned long readByte(char& byte);
+    int peekByte(unsigned char& byte);
+    std::size_t roomForRead(OutputBuffer& buffer, unsigned long elementSize,
+                            bool lastCameShort) const;
+    unsigned long readInto(OutputBuffer& buffer, std::size_t& room, unsigned long elementSize);
+    int completeTerminator(char16_t terminator, OutputBuffer& out);
 
     std::FILE* file;
     FilePermission* permission;

@@ -2,9 +2,9 @@
 
 #include "fileio/constants.h"
 #include "fileio/host/memory.h"
+#include "fileio/text/bounded_format.h"
 
 #include <algorithm>
-#include <cstdio>
 #include <cstring>
 #include <utility>
 
@@ -37,16 +37,12 @@ unsigned long outputStringStream::PutNElements(unsigned long count, const void* 
 
 int outputStringStream::print(const char* format, std::va_list arguments) {
     char scratch[constants::numberScratchBytes];
-    std::va_list again;
-    va_copy(again, arguments);
     const char* text = scratch;
-    const int length = std::vsnprintf(scratch, sizeof scratch, format, arguments);
-    if (length >= 0 && static_cast<std::size_t>(length) >= sizeof scratch) {
-        printScratch.resize(static_cast<std::size_t>(length) + 1);
-        std::vsnprintf(printScratch.data(), printScratch.size(), format, again);
-        text = printScratch.data();
-    }
-    va_end(again);
+    const auto grow = [this](std::size_t bytes) {
+        printScratch.resize(bytes);
+        return printScratch.data();
+    };
+    const int length = detail::formatBounded(scratch, grow, text, format, arguments);
     return length < 0 ? length : PutASCIIString(text, length);
 }
 
