@@ -15,6 +15,11 @@ namespace Orvandeil::FileIO {
 class CarryByte;
 class FilePermission;
 
+namespace detail {
+struct IntegerField;
+struct IntegerScan;
+}  // namespace detail
+
 // A stream over an open standard-library file. It owns neither the file nor the permission that
 // the file was opened with: both must outlive it, and the caller closes the file.
 //
@@ -49,6 +54,12 @@ public:
     bool Rewind(unsigned long count) override;
     void setBufferSize(unsigned long size) override;
 
+    // Numbers are read from the bytes as they stand, behind the six blanks of the C locale. The
+    // whole field is taken, but of a field without a width only the first 22 digits behind the
+    // sign, the leading zeros and the prefix count, of a wider one than 24 the first 24 characters.
+    // A field without digits gives back all that was read of it, and its status is 0 unless the
+    // read failed. scanFloat reads "inf" and "nan" (status -1 for a near miss, which is given back)
+    // and else what C's fscanf reads for "%le", which may leave the position behind a near miss.
     unsigned long scanOctal(long width, int& status, bool& flag) override;
     unsigned long scanHex(long width, int& status, bool& flag) override;
     unsigned long scanUnsignedInteger(long width, int& status, bool& flag) override;
@@ -120,6 +131,8 @@ private:
                             bool lastCameShort) const;
     unsigned long readInto(OutputBuffer& buffer, std::size_t& room, unsigned long elementSize);
     int completeTerminator(char16_t terminator, OutputBuffer& out);
+    detail::IntegerField scanField(const detail::IntegerScan& operation, long width, int& status);
+    double scanNumber(long width, int sign, int& status);
 
     std::FILE* file;
     FilePermission* permission;

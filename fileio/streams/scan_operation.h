@@ -39,6 +39,13 @@ struct IntegerField {
         if (overflow) return ULONG_MAX;
         return negative ? 0 - magnitude : magnitude;
     }
+
+    // The same for the scans that tell a negative number other than zero by a flag. Such a number
+    // out of range is 0.
+    unsigned long asFlagged(bool& flag) const {
+        flag = negative && asUnsigned() != 0;
+        return flag && overflow ? 0 : asUnsigned();
+    }
 };
 
 // Reads an optional sign, the base's prefix and digits from the start of `text`. It depends on no

@@ -74,8 +74,7 @@ unsigned long inputStringStream::scanUnsigned(const detail::IntegerScan& operati
     if (!text) return 0;
     const detail::IntegerField field = detail::parseInteger(*text, operation);
     take(field.consumed, status);
-    flag = field.negative && field.asUnsigned() != 0;
-    return flag && field.overflow ? 0 : field.asUnsigned();
+    return field.asFlagged(flag);
 }
 
 unsigned long inputStringStream::scanOctal(long width, int& status, bool& flag) {

@@ -1,0 +1,200 @@
+#include "fileio/scanf/fin_format_parser.h"
+
+#include "fileio/errors/code_list.h"
+#include "fileio/printf/escape_sequences.h"
+#include "fileio/scanf/conversion_table.h"
+#include "fileio/scanf/fin_format_pieces.h"
+
+#include <string>
+
+namespace Orvandeil::FileIO {
+namespace {
+
+constexpr int noSuchPiece = 45;  // positive on purpose: a host shows it as a system error
+
+// The "]" that closes the set whose first character is at `member`, or the end of the format.
+const char16_t* findSetEnd(const char16_t* member) {
+    if (*member == u'^') ++member;
+    if (*member == u']') ++member;
+    while (*member != u']' && *member != 0)
+        ++member;
+    return member;
+}
+
+}  // namespace
+
+finFormatParser::finFormatParser(const char16_t* format, TcodnStream* readFrom)
+    : input(readFrom), pieceStart(format), cursor(format) {}
+
+finFormatParser::~finFormatParser() = default;
+
+void finFormatParser::InitFormatPieces() {
+    resultClass = vxCHAR_CLASS;
+    do {
+        Piece piece = fiPkCreateNextScanFormatPiece();
+        if (!piece) {
+            pieces.push_back(
+                std::make_unique<finFormatPieceError>(finFormatPieceInitBlock{pieceStart}, error));
+            break;
+        }
+        addResultClass(*piece);
+        pieces.push_back(std::move(piece));
+    } while (*pieceStart != 0);
+    nextIndex = 0;
+}
+
+void finFormatParser::addResultClass(const finFormatPiece& piece) {
+    if (resultClass == vxCHAR_CLASS) {
+        resultClass = piece.getClassID();
+    } else if (!piece.isLiteral() && piece.getClassID() != resultClass) {
+        resultClass = vxDOUBLE_CLASS;
+    }
+}
+
+finFormatPiece* finFormatParser::fiPkGetNextScanFormatPiece(int& status) {
+    if (nextIndex == pieces.size()) {
+        nextIndex = 0;
+        recycled = true;
+    }
+    return fiPkGetScanFormatPiece(nextIndex++, status);
+}
+
+finFormatPiece* finFormatParser::fiPkGetScanFormatPiece(std::size_t index, int& status) {
+    if (index >= pieces.size()) {
+        status = noSuchPiece;
+        return nullptr;
+    }
+    status = 0;
+    pieces[index]->restoreWidth();
+    return pieces[index].get();
+}
+
+finFormatParser::Piece finFormatParser::fiPkCreateNextScanFormatPiece() {
+    cursor = pieceStart;
+    State state = State::NothingSeen;
+    while (true) {
+        for (; *cursor != u'%'; ++cursor) {
+            if (*cursor == 0) return parseEndOfFormat(state);
+            state = State::LiteralSeen;
+        }
+        Piece piece = parsePercentInFormat(state);
+        if (piece || error != 0) return piece;
+    }
+}
+
+finFormatParser::Piece finFormatParser::parsePercentInFormat(State state) {
+    if (state == State::LiteralSeen) {
+        if (cursor[1] != u'%') return createLiteralFormatPiece();
+        cursor += 2;
+        return nullptr;
+    }
+    ++cursor;
+    if (*cursor == 0) return recordError(code::InvalidFormat);
+    if (*cursor != u'%') return FinParseConversionPart();
+    ++cursor;
+    return parseDoublePercent();
+}
+
+// Behind a "%%" that begins a piece, a "%" is looked for one character too far: "%%a%d" is one
+// literal, "%%%%" no piece at all. Formats depend on it; it is kept on purpose.
+finFormatParser::Piece finFormatParser::parseDoublePercent() {
+    if (*cursor == 0 || cursor[1] != u'%') return createLiteralFormatPiece();
+    cursor += 2;
+    return nullptr;
+}
+
+finFormatParser::Piece finFormatParser::FinParseConversionPart() {
+    const std::optional<Field> field = CheckForAsteriskAndFieldWidth();
+    if (!field) return nullptr;
+    if (*cursor == u'[') return parseScansetConversion(*field);
+    return parseFormat(parseSubFormat(), *field);
+}
+
+std::optional<finFormatParser::Field> finFormatParser::CheckForAsteriskAndFieldWidth() {
+    Field field;
+    if (*cursor == u'*') field.asterisk = cursor++;
+    char16_t* end = nullptr;
+    const int number = scanUTF16Decimal(cursor, &end);
+    const bool hasWidth = end != cursor;
+    if (hasWidth) field.width = number;
+    cursor = end;
+    if (*cursor == 0 || (hasWidth && number < 1)) {
+        recordError(code::InvalidFormat);
+        return std::nullopt;
+    }
+    return field;
+}
+
+finFormatParser::Piece finFormatParser::parseScansetConversion(const Field& field) {
+    std::size_t open = static_cast<std::size_t>(cursor - pieceStart);
+    if (field.asterisk) --open;
+    cursor = findSetEnd(cursor + 1);
+    if (*cursor == 0) return recordError(code::InvalidFormat);
+    ++cursor;
+    const std::u16string text = takePieceText(field);
+    return std::make_unique<finFormatPieceCMATCH>(
+        finFormatPieceInitBlock{text, field.width, field.asterisk != nullptr}, open);
+}
+
+SUB_FORMAT finFormatParser::parseSubFormat() {
+    switch (*cursor) {
+        case u'h':
+            ++cursor;
+            return SUB_FORMAT::Short;
+        case u'l':
+            ++cursor;
+            return SUB_FORMAT::Long;
+        default:
+            return SUB_FORMAT::None;
+    }
+}
+
+finFormatParser::Piece finFormatParser::parseFormat(SUB_FORMAT sub, const Field& field) {
+    const detail::ScanConversion* conversion = detail::findScanConversion(*cursor);
+    if (!conversion || !conversion->create[static_cast<int>(sub)])
+        return recordError(code::InvalidFormat);
+    ++cursor;
+    return createNewFormatPiece(conversion->format, sub, field);
+}
+
+finFormatParser::Piece finFormatParser::createNewFormatPiece(FORMAT kind, SUB_FORMAT sub,
+                                                             const Field& field) {
+    const std::u16string text = takePieceText(field);
+    return detail::scanConversion(kind).create[static_cast<int>(sub)](
+        {text, field.width, field.asterisk != nullptr});
+}
+
+finFormatParser::Piece finFormatParser::createLiteralFormatPiece() {
+    const std::u16string text = takePieceText({});
+    return std::make_unique<finFormatPieceLiteral>(finFormatPieceInitBlock{text, 0, false}, input);
+}
+
+finFormatParser::Piece finFormatParser::parseEndOfFormat(State state) {
+    switch (state) {
+        case State::NothingSeen:
+            return recordError(code::InvalidFormat);
+        case State::LiteralSeen:
+            return createLiteralFormatPiece();
+    }
+    return recordError(code::InternalError);
+}
+
+finFormatParser::Piece finFormatParser::recordError(int code) {
+    error = code;
+    return nullptr;
+}
+
+// The text up to the cursor, where the next piece begins.
+std::u16string finFormatParser::takePieceText(const Field& field) {
+    std::u16string text;
+    if (field.asterisk) {
+        text.assign(pieceStart, field.asterisk);
+        text.append(field.asterisk + 1, cursor);
+    } else {
+        text.assign(pieceStart, cursor);
+    }
+    pieceStart = cursor;
+    return text;
+}
+
+}  // namespace Orvandeil::FileIO

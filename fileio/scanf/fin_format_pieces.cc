@@ -1,0 +1,131 @@
+#include "fileio/scanf/fin_format_pieces.h"
+
+#include "fileio/errors/code_list.h"
+#include "fileio/host/text.h"
+
+#include <algorithm>
+
+#include <unicode/utf16.h>
+
+namespace Orvandeil::FileIO {
+namespace {
+
+constexpr std::size_t firstTextChunk = 1024;
+constexpr std::size_t smallestTextChunk = 64;
+constexpr std::size_t largestTextChunk = 8388608;
+
+// Lets `read` append characters to the result: straight away when it holds characters, else
+// through a buffer of their own. False when there were none.
+template <class Read>
+bool appendText(OutputBuffer& result, bool suppress, Read read) {
+    if (!suppress && result.GetClassID() == vxCHAR_CLASS) return read(result) != 0;
+    OutputBuffer text(vxCHAR_CLASS, firstTextChunk, smallestTextChunk, largestTextChunk);
+    if (read(text) == 0) return false;
+    if (!suppress) result.AppendBuffer(text);
+    return true;
+}
+
+// Takes one code point of a NUL-terminated text.
+char32_t nextCodePoint(const char16_t*& text) {
+    int length = 0;
+    UChar32 point;
+    U16_NEXT(text, length, -1, point);
+    text += length;
+    return static_cast<char32_t>(point);
+}
+
+}  // namespace
+
+unsigned long finFormatPieceS::scan(TcodnStream& input, OutputBuffer& result, bool /*hostFlag*/,
+                                    bool& failed, int& status) {
+    const auto readWord = [this, &input](OutputBuffer& out) {
+        return input.GetString(out, std::max(width, 0), width < 0);
+    };
+    if (!appendText(result, suppress, readWord)) return fail(input.getErrorCode(), failed, status);
+    return suppress ? 0 : 1;
+}
+
+unsigned long finFormatPieceC::scan(TcodnStream& input, OutputBuffer& result, bool /*hostFlag*/,
+                                    bool& failed, int& status) {
+    const auto readCharacters = [this, &input](OutputBuffer& out) {
+        return input.GetNCodePoints(out, static_cast<unsigned long>(std::max(width, 1)), nullptr);
+    };
+    if (!appendText(result, suppress, readCharacters))
+        return fail(input.getErrorCode(), failed, status);
+    return suppress ? 0 : 1;
+}
+
+finFormatPieceCMATCH::finFormatPieceCMATCH(const finFormatPieceInitBlock& init,
+                                           std::size_t openBracket)
+    : finFormatPieceOfText(init), open(openBracket) {}
+
+unsigned long finFormatPieceCMATCH::scan(TcodnStream& input, OutputBuffer& result,
+                                         bool /*hostFlag*/, bool& failed, int& status) {
+    bool matched = false;
+    for (; width != 0; width -= width > 0 ? 1 : 0) {
+        std::size_t bytes = 0;
+        if (input.GetNCodePoints(oneChar, 1, &bytes) == 0) {
+            if (!matched) return fail(0, failed, status);
+            break;
+        }
+        if (!accepts(oneChar.front())) {
+            input.Rewind(bytes);
+            break;
+        }
+        matched = true;
+        if (!suppress) result.AppendData(vxCHAR_CLASS, oneChar.data(), oneChar.size());
+    }
+    if (!matched) return fail(code::MatchingFailure, failed, status);
+    return suppress ? 0 : 1;
+}
+
+// Where a range could begin with a "-" or behind another range, it does: only a "-" directly before
+// the closing bracket ends no range.
+bool finFormatPieceCMATCH::accepts(char16_t character) const {
+    const char16_t* at = getText().data() + open + 1;
+    const bool negated = *at == u'^';
+    if (negated) ++at;
+    do {
+        const char32_t first = nextCodePoint(at);
+        char32_t last = first;
+        if (at[0] == u'-' && at[1] != u']') last = nextCodePoint(++at);
+        const auto [low, high] = std::minmax(first, last);
+        if (character >= low && character <= high) return !negated;
+    } while (*at != u']');
+    return negated;
+}
+
+finFormatPieceLiteral::finFormatPieceLiteral(const finFormatPieceInitBlock& init,
+                                             TcodnStream* readFrom)
+    : finFormatPieceOfText(init), source(readFrom) {}
+
+unsigned long finFormatPieceLiteral::scan(TcodnStream& /*input*/, OutputBuffer& /*result*/,
+                                          bool /*hostFlag*/, bool& failed, int& status) {
+    const std::u16string_view wanted = getText();
+    for (std::size_t i = 0; i < wanted.size();) {
+        if (qzu_isbreakablespace(wanted[i])) {
+            source->SkipWhiteSpace();
+            ++i;
+            continue;
+        }
+        std::size_t bytes = 0;
+        if (source->GetNCodePoints(oneChar, 1, &bytes) == 0) return fail(0, failed, status);
+        if (oneChar.front() != wanted[i]) {
+            source->Rewind(bytes);
+            return fail(code::MatchingFailure, failed, status);
+        }
+        // The character behind a "%" is not looked at; this is on purpose.
+        i += wanted[i] == u'%' ? 2 : 1;
+    }
+    return 0;
+}
+
+finFormatPieceError::finFormatPieceError(const finFormatPieceInitBlock& init, int errorCode)
+    : finFormatPieceOfText(init), code(errorCode) {}
+
+unsigned long finFormatPieceError::scan(TcodnStream& /*input*/, OutputBuffer& /*result*/,
+                                        bool /*hostFlag*/, bool& failed, int& status) {
+    return fail(code, failed, status);
+}
+
+}  // namespace Orvandeil::FileIO
