@@ -40,4 +40,8 @@ Memory& memory();
 // The identifiers of the warnings issued so far.
 std::vector<std::string>& warnings();
 
+// What the console showed since the last call: its output, and its errors and messages.
+std::string takeOutput();
+std::string takeErrors();
+
 }  // namespace own_host

@@ -6,6 +6,7 @@
 #include <charconv>
 #include <cmath>
 #include <iterator>
+#include <string_view>
 
 bool qzu_isbreakablespace(char16_t unit) {
     return unit == u' ' || (unit >= u'\t' && unit <= u'\r');
@@ -33,6 +34,19 @@ bool vxTextWidenAscii(const char* text, std::size_t count, char16_t* out) {
 
 std::string vxTextCanonicalEncodingName(const char* name) {
     return name;
+}
+
+bool vxTextEncodingIsSupported(const char* canonicalName) {
+    constexpr std::string_view supported[] = {"US-ASCII", "ISO-8859-1", "UTF-8", "UTF-16"};
+    return std::find(std::begin(supported), std::end(supported), canonicalName) !=
+           std::end(supported);
+}
+
+// A byte-order mark is all that this host goes by.
+std::string vxTextDetectCharset(const char* bytes, std::size_t count, vxConsoleSink&,
+                                const std::u16string&) {
+    const std::string_view start(bytes, std::min<std::size_t>(count, 2));
+    return start == "\xFF\xFE" || start == "\xFE\xFF" ? "UTF-16" : "UTF-8";
 }
 
 double vxTextToDouble(const char* text, std::size_t count, std::size_t* consumed) {

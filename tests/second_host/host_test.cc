@@ -1,11 +1,14 @@
 #include "examples/own_host/own_host.h"
+#include "fileio/attributes/file_permission.h"
 #include "fileio/attributes/size_attribute.h"
 #include "fileio/buffers/output_buffer.h"
 #include "fileio/errors/identifiers.h"
 #include "fileio/host/memory.h"
 #include "fileio/printf/escape_sequences.h"
 #include "fileio/printf/printf_controller.h"
+#include "fileio/text/output_screen_stream.h"
 #include "fileio/text/output_string_stream.h"
+#include "fileio/text/std_err_stream.h"
 
 #include <cmath>
 
@@ -70,6 +73,20 @@ TEST_F(SecondHost, RaisesWithItsOwnMessages) {
     } catch (const IMsgIDException& error) {
         EXPECT_STREQ(error.what(), "KESTRA:iofun:InvalidEncoding no such encoding");
     }
+}
+
+TEST_F(SecondHost, ShowsTheConsole) {
+    FilePermission permission;
+    const Array arguments[] = {chars(u"h\u00e9"), doubles(1, 1, {3})};
+    const vxArray* list[] = {arguments[0].get(), arguments[1].get()};
+    outputScreenStream screen(stdout, permission);
+    stdErrStream errors(stderr, permission);
+    for (TcodnStream* stream : {static_cast<TcodnStream*>(&screen),  //
+                                static_cast<TcodnStream*>(&errors)}) {
+        EXPECT_TRUE(printfController(u"%s=%d.", stream, list, 2).doPrintf());
+    }
+    EXPECT_EQ(own_host::takeOutput(), "h\xE9=3.");
+    EXPECT_EQ(own_host::takeErrors(), "h\xE9=3.");
 }
 
 TEST_F(SecondHost, TakesWarnings) {
