@@ -83,6 +83,8 @@ void TcodnStream::SetEncodingSpecificFlags() {
     latinFixed = std::any_of(latinFixedNames.begin(), latinFixedNames.end(),
                              [name](const char* latin) { return sameName(name, latin); });
     utf16 = sameName(name, "UTF-16");
+    const UConverterType type = ucnv_getType(converter);
+    asciiTransparent = type == UCNV_UTF8 || type == UCNV_LATIN_1 || type == UCNV_US_ASCII;
 }
 
 void TcodnStream::CheckStatus(UErrorCode status) {

@@ -95,6 +95,8 @@ private:
     std::u16string oneChar;
     std::string writeBytes;
     std::u16string asciiText;
+    bool asciiTransparent = false;  // without state, and bytes of 7-bit ASCII stand for themselves
+    bool midCharacter = false;      // the converter holds part of what it has read
 };
 
 }  // namespace Orvandeil::FileIO

@@ -17,12 +17,34 @@ struct TcodnStream::Undecoded {
     std::size_t bytesRead = 0;
     bool endOfData = false;
     bool exhausted = false;  // the last round neither took a byte nor made a unit
+
+    void drop(std::size_t bytes) {
+        next += bytes;
+        count -= bytes;
+    }
 };
 
 namespace {
 
 constexpr unsigned long largestRead = 2147483647;
 constexpr std::size_t largestConversion = 0x3FFFFFFD;
+
+#ifdef FILEIO_FAST_PATHS
+// Widens the leading ASCII bytes and returns their number.
+std::size_t widenAscii(const char* bytes, std::size_t count, char16_t* out) {
+    std::size_t i = 0;
+    for (; i < count && static_cast<unsigned char>(bytes[i]) < 0x80; ++i) {
+        out[i] = static_cast<unsigned char>(bytes[i]);
+    }
+    return i;
+}
+#endif
+
+// Whether the converter keeps bytes or units back for its next call.
+bool holdsBack(const UConverter* converter, UErrorCode status) {
+    UErrorCode ignored = U_ZERO_ERROR;
+    return status == U_BUFFER_OVERFLOW_ERROR || ucnv_toUCountPending(converter, &ignored) != 0;
+}
 
 // Each pair becomes the one unit U+001A, each surrogate without its partner as well.
 unsigned long replacePairs(char16_t* units, unsigned long count) {
@@ -102,19 +124,26 @@ unsigned long TcodnStream::decode(Undecoded& bytes, char16_t* out, unsigned long
 
 unsigned long TcodnStream::convert(Undecoded& bytes, char16_t* out, unsigned long room,
                                    UConverter* from) {
+#ifdef FILEIO_FAST_PATHS
+    if (asciiTransparent && !midCharacter) {
+        const std::size_t ascii = widenAscii(bytes.next, std::min(bytes.count, room), out);
+        bytes.drop(ascii);
+        if (ascii != 0) return ascii;
+    }
+#endif
     const char* source = bytes.next;
     const char* const sourceEnd = source + std::min(bytes.count, constants::converterPieceBytes);
     char16_t* target = out;
     const char16_t* const targetEnd = out + std::min(room, constants::converterPieceBytes);
     UErrorCode status = U_ZERO_ERROR;
     ucnv_toUnicode(from, &target, targetEnd, &source, sourceEnd, nullptr, bytes.endOfData, &status);
+    midCharacter = holdsBack(from, status);
     // A full target is how a round ends, and no failure.
     if (status == U_BUFFER_OVERFLOW_ERROR && target == targetEnd) status = U_ZERO_ERROR;
     if (U_FAILURE(status) && bytes.bytesRead > largestConversion) throw ConversionSizeError();
 
     bytes.exhausted = target == out && source == bytes.next;
-    bytes.count -= static_cast<std::size_t>(source - bytes.next);
-    bytes.next = source;
+    bytes.drop(static_cast<std::size_t>(source - bytes.next));
     auto units = static_cast<unsigned long>(target - out);
     if (units != 0 && U16_IS_LEAD(target[-1])) dropHeldUnit(from);
     if (!latinFixed) units = replacePairs(out, units);
