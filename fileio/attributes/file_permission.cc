@@ -12,7 +12,7 @@ FilePermission::FilePermission(const char* mode, bool constructionFlagValue) : F
 }
 
 FilePermission& FilePermission::operator=(const char* mode) {
-    valid = Init(mode);
+    CharAttrValidator::operator=(mode);
     return *this;
 }
 

@@ -39,7 +39,7 @@ MachineFormat::MachineFormat(const char* name) : MachineFormat() {
 }
 
 MachineFormat& MachineFormat::operator=(const char* name) {
-    valid = Init(name);
+    CharAttrValidator::operator=(name);
     return *this;
 }
 

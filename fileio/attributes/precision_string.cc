@@ -204,7 +204,7 @@ PrecisionString& PrecisionString::operator=(const PrecisionString& other) {
 }
 
 PrecisionString& PrecisionString::operator=(const char* precision) {
-    valid = Init(precision);
+    CharAttrValidator::operator=(precision);
     return *this;
 }
 
