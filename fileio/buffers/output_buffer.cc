@@ -141,7 +141,7 @@ void OutputBuffer::Clear() {
 
 void OutputBuffer::Rollback() {
     if (rollbackStart == nullptr) {
-        // Not "nothing to take back": callers mark before every step and rely on this.
+        // On purpose everything, not nothing, though nothing was allocated since the mark.
         dropChunksFrom(0);
         return;
     }

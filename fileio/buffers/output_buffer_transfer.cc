@@ -22,7 +22,7 @@ std::size_t rowsFor(const SizeAttribute& size, std::size_t count, vxClassID clas
 
 Shape shapeFor(std::size_t rows, std::size_t count, std::size_t divisor) {
     const std::size_t columns = count / divisor + (count % divisor != 0);
-    // A single row becomes a column, on purpose: callers expect it of every size but a wide one.
+    // A single row becomes a column. This is on purpose.
     return rows == 1 ? Shape{columns, 1} : Shape{rows, columns};
 }
 
