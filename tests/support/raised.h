@@ -1,0 +1,24 @@
+#pragma once
+
+#include "fileio/host/exception.h"
+
+#include <string>
+
+namespace fileio_tests {
+
+// The identifier that `run` raises and the arguments it carries, with blanks between; empty when
+// nothing is raised.
+template <class Run>
+std::string raisedBy(Run run) {
+    try {
+        run();
+    } catch (const foundation::core::except::IMsgIDException& error) {
+        std::string raised = error.GetID();
+        for (const std::string& argument : error.GetBaseMsgIDObj().GetArguments())
+            raised += ' ' + argument;
+        return raised;
+    }
+    return "";
+}
+
+}  // namespace fileio_tests
