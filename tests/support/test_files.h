@@ -1,0 +1,61 @@
+#pragma once
+
+#include "fileio/attributes/file_permission.h"
+#include "fileio/streams/file_stream.h"
+
+#include <cstdio>
+#include <string>
+#include <string_view>
+
+// Files for tests of streams: real ones, and files whose operations can be made to fail.
+namespace support {
+
+// A file of its own, removed at the end.
+class TempFile {
+public:
+    explicit TempFile(std::string_view content = {});
+    ~TempFile();
+    TempFile(const TempFile&) = delete;
+    TempFile& operator=(const TempFile&) = delete;
+
+    const std::string& path() const { return filePath; }
+    std::string content() const;
+
+private:
+    std::string filePath;
+};
+
+// A file opened by path and permission, and the stream over it.
+struct OpenedFile {
+    explicit OpenedFile(const std::string& path, const char* mode = "r",
+                        const std::string& encoding = "");
+    // Takes over a file opened in another way.
+    OpenedFile(std::FILE* openFile, const char* mode, const std::string& encoding = "");
+    ~OpenedFile();
+
+    // Reads up to `count` bytes one by one.
+    std::string read(unsigned long count);
+    long position();
+
+    Orvandeil::FileIO::FilePermission permission;
+    std::FILE* file;
+    Orvandeil::FileIO::fileStream stream;
+};
+
+// A file in memory, unbuffered. From a given call on (counted from 1, 0 is never), its reads,
+// writes or seeks fail with `error`, which may be 0.
+struct FaultyFile {
+    std::FILE* open(const char* mode);
+
+    std::string bytes;
+    std::size_t offset = 0;
+    int failingRead = 0;
+    int failingWrite = 0;
+    int failingSeek = 0;
+    int error = 0;
+    int reads = 0;
+    int writes = 0;
+    int seeks = 0;
+};
+
+}  // namespace support
