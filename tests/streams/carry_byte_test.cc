@@ -39,28 +39,17 @@ TEST(CarryByte, MergesWithTheFile) {
     } rows[] = {
         {__LINE__, "r+", "\xFF", bigEndian, 0xA0, 3, 0, "\xBF", 0},
         {__LINE__, "r+", "\xFF", littleEndian, 0x05, 3, 0, "\xFD", 0},
-        {__LINE__, "r+",
-         "\x55"
-         "z",
-         bigEndian, 0x80, 1, 0,
-         "\xD5"
-         "z",
-         0},
-        {
-            __LINE__,
-            "r+",
-            "\x55"
-            "z",
-            {__LINE__, "r+", "\xD5z", littleEndian, 0x00, 7, 0, "\x80z", 0},
-            {__LINE__, "r+", "\xFF", littleEndian, 0x41, 8, 0, "A", 0},
-            {__LINE__, "r+", "", littleEndian, 0x41, 8, 0, "A", 0},
-            {__LINE__, "r+", "", littleEndian, 0x01, 3, 1, "", code::ReadFailed},
-            {__LINE__, "r+", "\xFF", littleEndian, 0x01, 0, 0, "\xFF", 0},
-            {__LINE__, "w", "", bigEndian, 0xA0, 3, 0, "\xA0", 0},
-            {__LINE__, "w+", "", littleEndian, 0x05, 3, 0, "\x05", 0},
-            {__LINE__, "a", "x", littleEndian, 0x05, 3, 1, "x", code::IsOpenWrite},
-            {__LINE__, "r", "\xFF", littleEndian, 0x05, 3, 1, "\xFF", code::IsOpenWrite},
-        };
+        {__LINE__, "r+", "\x55z", bigEndian, 0x80, 1, 0, "\xD5z", 0},
+        {__LINE__, "r+", "\xD5z", littleEndian, 0x00, 7, 0, "\x80z", 0},
+        {__LINE__, "r+", "\xFF", littleEndian, 0x41, 8, 0, "A", 0},
+        {__LINE__, "r+", "", littleEndian, 0x41, 8, 0, "A", 0},
+        {__LINE__, "r+", "", littleEndian, 0x01, 3, 1, "", code::ReadFailed},
+        {__LINE__, "r+", "\xFF", littleEndian, 0x01, 0, 0, "\xFF", 0},
+        {__LINE__, "w", "", bigEndian, 0xA0, 3, 0, "\xA0", 0},
+        {__LINE__, "w+", "", littleEndian, 0x05, 3, 0, "\x05", 0},
+        {__LINE__, "a", "x", littleEndian, 0x05, 3, 1, "x", code::IsOpenWrite},
+        {__LINE__, "r", "\xFF", littleEndian, 0x05, 3, 1, "\xFF", code::IsOpenWrite},
+    };
     for (const auto& row : rows) {
         const TempFile file(row.content);
         {
