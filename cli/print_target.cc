@@ -136,9 +136,9 @@ public:
     int close() override {
         const WrittenBytes bytes(text);
         errno = 0;
-        const std::size_t written =
-            std::fwrite(bytes.view().data(), 1, bytes.view().size(), file.get());
-        const bool complete = written == bytes.view().size();
+        const std::string_view content = bytes.view();  // null when nothing was written
+        const bool complete = content.empty() || std::fwrite(content.data(), 1, content.size(),
+                                                             file.get()) == content.size();
         const bool closed = std::fclose(file.release()) == 0;
         if (complete && closed) return 0;
         return errno != 0 ? errno : code::FlushError;
