@@ -74,6 +74,7 @@ unsigned long fileStream::GetNElements(unsigned long count, char* buffer,
     if (total < count) recordFailure();
     // Counted in elements whatever their size, on purpose.
     if (total != 0) lastByteRead = static_cast<unsigned char>(buffer[total - 1]);
+    recentBytes.add(buffer, total * elementSize);
     return total;
 }
 
@@ -85,6 +86,7 @@ unsigned long fileStream::readByte(char& byte) {
         return 0;
     }
     lastByteRead = static_cast<unsigned char>(found);
+    recentBytes.add(found);
     byte = static_cast<char>(found);
     return 1;
 }
@@ -122,12 +124,16 @@ bool fileStream::EndOfData() {
 }
 
 bool fileStream::Rewind(unsigned long count) {
-    // The two values that stand for "nothing read" and, as a signed byte, for the end of the file.
-    const bool canPushBack = lastByteRead != 0x00 && lastByteRead != 0xFF;
+    const unsigned char last = std::exchange(lastByteRead, 0);
     errno = 0;
-    const bool moved =
-        count == 1 && canPushBack ? std::ungetc(lastByteRead, file) != EOF : stepBack(file, count);
-    lastByteRead = 0;
+    bool moved = false;
+    // Two values stand for "nothing read" and, as a signed byte, for the end of the file.
+    if (count == 1 && last != 0x00 && last != 0xFF) {
+        moved = std::ungetc(last, file) != EOF;
+        recentBytes.drop();
+    } else {
+        moved = stepBack(file, count) || (errno == ESPIPE && recentBytes.pushBack(file, count));
+    }
     if (!moved) recordFailure();
     return moved;
 }

@@ -2,6 +2,7 @@
 
 #include "fileio/buffers/output_buffer.h"
 #include "fileio/export.h"
+#include "fileio/streams/recent_bytes.h"
 #include "fileio/text/tcodn_stream.h"
 
 #include <cstdarg>
@@ -50,7 +51,8 @@ public:
     // The standard library's bytes, whatever the encoding.
     int print(const char* format, std::va_list arguments) override;
     bool EndOfData() override;
-    // Undoes the read just made; works on files that can seek, and for one byte on most others.
+    // Undoes the read just made. Where the file cannot seek, the bytes of one character at most are
+    // pushed back.
     bool Rewind(unsigned long count) override;
     void setBufferSize(unsigned long size) override;
 
@@ -131,6 +133,7 @@ private:
                             bool lastCameShort) const;
     unsigned long readInto(OutputBuffer& buffer, std::size_t& room, unsigned long elementSize);
     int completeTerminator(char16_t terminator, OutputBuffer& out);
+    void beginScan();
     detail::IntegerField scanField(const detail::IntegerScan& operation, long width, int& status);
     double scanNumber(long width, int sign, int& status);
 
@@ -145,6 +148,7 @@ private:
     unsigned char lastByteRead = 0;  // what Rewind(1) pushes back; 0: nothing
     std::unique_ptr<CarryByte> carryByte;
     std::string spareText;
+    detail::RecentBytes recentBytes;
 };
 
 }  // namespace Orvandeil::FileIO

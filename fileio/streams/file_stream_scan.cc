@@ -207,9 +207,14 @@ bool takePlainDecimal([[maybe_unused]] std::FILE* file, [[maybe_unused]] long wi
 }  // namespace
 
 // What a Rewind gives back must not be a byte that was read before the field.
-IntegerField fileStream::scanField(const IntegerScan& operation, long width, int& status) {
+void fileStream::beginScan() {
     errno = 0;
     lastByteRead = 0;
+    recentBytes.clear();
+}
+
+IntegerField fileStream::scanField(const IntegerScan& operation, long width, int& status) {
+    beginScan();
     IntegerCollector collector(file, operation, width);
     if (!collector.collect()) {
         recordFailure();
@@ -243,8 +248,7 @@ long fileStream::scanIntegerCouldBeHex(long width, int& status) {
 }
 
 double fileStream::scanFloat(long width, int& status) {
-    errno = 0;
-    lastByteRead = 0;
+    beginScan();
     FloatStart start(file);
     if (start.isNonFinite()) {
         if (status == untouched) return start.nonFiniteValue();

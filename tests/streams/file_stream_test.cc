@@ -166,19 +166,29 @@ TEST(FileStream, Rewinds) {
     }
 }
 
-TEST(FileStream, PushesOneByteBackIntoAPipe) {
+TEST(FileStream, PushesBytesBackIntoAPipe) {
+    const std::string content = std::string("abcdefghi\xFFj") + '\0';
     int ends[2];
     ASSERT_EQ(pipe(ends), 0);
-    ASSERT_EQ(write(ends[1], "a\xFF", 2), 2);
+    ASSERT_EQ(write(ends[1], content.data(), content.size()), static_cast<ssize_t>(content.size()));
     close(ends[1]);
     OpenedFile opened(fdopen(ends[0], "r"), "r");
     EXPECT_EQ(opened.read(1), "a");
     EXPECT_TRUE(opened.stream.Rewind(1));
-    // The second step has nothing to push back any more, 0xFF never has.
+    // There is nothing left to push back.
     EXPECT_FALSE(opened.stream.Rewind(1));
     EXPECT_EQ(opened.stream.getErrorCode(), ESPIPE);
-    EXPECT_EQ(opened.read(2), "a\xFF");
-    EXPECT_FALSE(opened.stream.Rewind(1));
+    EXPECT_EQ(opened.read(10), content.substr(0, 10));
+    EXPECT_FALSE(opened.stream.Rewind(9));
+    EXPECT_TRUE(opened.stream.Rewind(1));
+    EXPECT_TRUE(opened.stream.Rewind(7));
+    EXPECT_EQ(opened.read(99), content.substr(2));
+    EXPECT_TRUE(opened.stream.Rewind(1));
+    EXPECT_FALSE(opened.stream.EndOfData());
+    char block[5];
+    EXPECT_EQ(opened.stream.GetNElements(5, block, 1), 1u);
+    EXPECT_TRUE(opened.stream.Rewind(3));
+    EXPECT_EQ(opened.read(99), content.substr(9));
     long position = 7;
     EXPECT_NE(opened.stream.getPosition(position), 0);
     EXPECT_EQ(position, 7);
