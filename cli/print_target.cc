@@ -5,6 +5,7 @@
 #include "fileio/errors/code_list.h"
 #include "fileio/host/memory.h"
 #include "fileio/host/text.h"
+#include "fileio/text/output_screen_stream.h"
 #include "fileio/text/output_string_stream.h"
 
 #include <algorithm>
@@ -17,6 +18,7 @@
 namespace cli {
 
 using Orvandeil::FileIO::FilePermission;
+using Orvandeil::FileIO::outputScreenStream;
 using Orvandeil::FileIO::outputStringStream;
 using Orvandeil::FileIO::TcodnStream;
 namespace code = Orvandeil::FileIO::code;
@@ -107,19 +109,18 @@ private:
 
 class ConsoleTarget : public PrintTarget {
 public:
-    explicit ConsoleTarget(Report& console) : report(console) {}
-
-    TcodnStream& stream() override { return text; }
+    TcodnStream& stream() override { return screen; }
 
     int close() override {
-        const WrittenBytes bytes(text);
-        report.print(vxTextToNarrow(bytes.units().data(), bytes.units().size()));
-        return 0;
+        errno = 0;
+        const bool delivered = screen.flush() == 1;
+        if (delivered) return 0;
+        return errno != 0 ? errno : code::FlushError;
     }
 
 private:
-    outputStringStream text{""};
-    Report& report;
+    FilePermission permission{"w", false};
+    outputScreenStream screen{stdout, permission};
 };
 
 class FileTarget : public PrintTarget {
@@ -166,7 +167,7 @@ std::unique_ptr<PrintTarget> openPrintTarget(const CommandLine& line, Report& re
     const std::string encoding(line.valueOr("encoding", ""));
     if (line.has("output")) return openFile(line, encoding);
     if (report.isJson()) return std::make_unique<JsonTarget>(encoding, report);
-    return std::make_unique<ConsoleTarget>(report);
+    return std::make_unique<ConsoleTarget>();
 }
 
 }  // namespace cli

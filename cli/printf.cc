@@ -81,14 +81,15 @@ void runPrintf(const CommandLine& line, Report& report) {
     } catch (const IMsgIDException&) {
         raised = std::current_exception();
     }
-    // Whatever happened, what was written before it stays written.
+    // Whatever happened, what was written before it stays written. A failure without a code
+    // is explained by that of the target, where there is one.
     const int closeFailure = target->close();
     if (raised) {
         tellRaised(raised, piecePlace(format, controller.getCurrentPiece()), report);
-    } else if (!complete) {
+    } else if (!complete && (controller.getErrorCode() != 0 || closeFailure == 0)) {
         tellFailure(format, controller, report);
     }
-    if (closeFailure != 0) report.fail(closeFailure, line.valueOr("output", ""));
+    if (closeFailure != 0) report.fail(closeFailure, line.valueOr("output", "standard output"));
 }
 
 constexpr Option options[] = {
