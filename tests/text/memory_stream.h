@@ -15,7 +15,6 @@ public:
     explicit MemoryStream(const std::string& encoding, std::string bytes = {})
         : TcodnStream(encoding), input(std::move(bytes)) {}
 
-    using TcodnStream::asciiCheck;
     using TcodnStream::CheckStatus;
 
     std::string input;

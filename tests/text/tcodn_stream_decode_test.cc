@@ -184,9 +184,6 @@ TEST(Decoding, AsksForDetectionOnlyWhereAsciiEnds) {
     MemoryStream undecided("", "\x80z");
     undecided.detected = "";
     EXPECT_EQ(undecided.GetEncodingName(), "UTF-8");
-    MemoryStream stream("");
-    EXPECT_EQ(stream.asciiCheck("ab\x80", 3), 2U);
-    EXPECT_EQ(stream.asciiCheck("\x80", 1), 0U);
 }
 
 TEST(Decoding, ReadsWordsUpToTheBlankBehindThem) {

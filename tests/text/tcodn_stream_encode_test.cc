@@ -1,5 +1,4 @@
 #include "fileio/host/exception.h"
-#include "fileio/text/conversion_size_error.h"
 #include "tests/text/memory_stream.h"
 
 #include <clocale>
@@ -34,15 +33,16 @@ std::string encodedAtOnce(const char* encoding, const std::u16string& text) {
 TEST(Encoding, DoesNotDependOnWhereTheTextIsCut) {
     std::mt19937 random(1);
     const std::u16string alphabet = u"ab\u00E9\u3042\u30A2\u0416\U0001F600\xD83D\xDE01\xFFFD";
-    for (int round = 0; round < 1200; ++round) {
+    for (int round = 0; round < 1210; ++round) {
         const char* encoding = encodings[static_cast<std::size_t>(round) % std::size(encodings)];
-        std::u16string text(random() % 90, u'\0');
+        // The last rounds take texts of which some grow the scratch many times over.
+        std::u16string text(random() % (round < 1200 ? 90 : 100000), u'\0');
         for (char16_t& unit : text)
             unit = alphabet[random() % alphabet.size()];
         MemoryStream stream(encoding);
         int calls = 0;
         for (std::size_t at = 0; at < text.size(); ++calls) {
-            const std::size_t n = 1 + random() % 30;
+            const std::size_t n = 1 + random() % (text.size() / 3 + 1);
             stream.PutString(std::u16string_view(text).substr(at, n));
             at += n;
         }
@@ -50,16 +50,6 @@ TEST(Encoding, DoesNotDependOnWhereTheTextIsCut) {
         EXPECT_EQ(stream.writes, calls);
         EXPECT_EQ(stream.getErrorCode(), 0);
     }
-}
-
-TEST(Encoding, WritesALongTextAtOnce) {
-    std::u16string text;
-    for (int i = 0; i < 100000; ++i)
-        text += u"a\u3042\U0001F600";
-    MemoryStream stream("UTF-8");
-    EXPECT_EQ(stream.PutString(text), text.size());
-    EXPECT_EQ(stream.writes, 1);
-    EXPECT_EQ(stream.output, encodedAtOnce("UTF-8", text));
 }
 
 TEST(Encoding, CountsByEncoding) {
@@ -159,12 +149,6 @@ TEST(TcodnStream, MakesThePointADecimalPoint) {
     if (!std::setlocale(LC_NUMERIC, "C.UTF-8")) GTEST_SKIP() << "no second locale here";
     MemoryStream stream("");
     EXPECT_STREQ(std::setlocale(LC_NUMERIC, nullptr), "C");
-}
-
-TEST(ConversionSizeError, SaysWhatItIs) {
-    const ConversionSizeError error;
-    EXPECT_STREQ(error.what(), "Data size too large for character code conversion.");
-    EXPECT_EQ(error.kind(), 6);
 }
 
 }  // namespace
