@@ -65,54 +65,40 @@ TEST(CarryByte, MergesWithTheFile) {
     }
 }
 
-// What a transfer finds and leaves, for every state of the carry.
-TEST(CarryByte, CheckBeforeATransfer) {
-    for (const bool active : {false, true}) {
-        for (const bool wasRead : {false, true}) {
-            for (const int oldFormat : {littleEndian, bigEndian}) {
-                for (const bool isRead : {false, true}) {
-                    for (const int format : {littleEndian, bigEndian}) {
-                        const TempFile file("\xFF\xFF");
-                        OpenedFile opened(file.path(), "r+");
-                        CarryByte& carry = opened.stream.getCarryByte();
-                        setCarry(carry, wasRead, oldFormat, 0, 4);
-                        carry.active = active;
-                        EXPECT_TRUE(carry.CheckCarryByte(1, format, isRead));
-                        const bool goesOn = active && wasRead == isRead && oldFormat == format;
-                        EXPECT_EQ(carry.pendingBits, goesOn ? 4 : 0);
-                        EXPECT_EQ(carry.lastWasWrite, isRead ? 0 : 1);
-                        EXPECT_EQ(carry.bitOrder, format);
-                        EXPECT_EQ(carry.active, active);
-                        EXPECT_EQ(opened.position(), active && !wasRead && !goesOn ? 1 : 0);
-                    }
-                }
-            }
-        }
+// What a bit transfer leaves, for every state of the carry that it finds.
+TEST(CarryByte, CheckBeforeABitTransfer) {
+    for (int states = 0; states < 32; ++states) {
+        const bool active = states & 1, wasRead = states & 2, isRead = states & 4;
+        const int oldFormat = (states & 8) / 8, format = (states & 16) / 16;
+        const TempFile file("\xFF\xFF");
+        OpenedFile opened(file.path(), "r+");
+        CarryByte& carry = opened.stream.getCarryByte();
+        setCarry(carry, wasRead, oldFormat, 0, 4);
+        carry.active = active;
+        EXPECT_TRUE(carry.CheckCarryByte(1, format, isRead));
+        const bool goesOn = active && wasRead == isRead && oldFormat == format;
+        EXPECT_EQ(carry.pendingBits, goesOn ? 4 : 0) << states;
+        EXPECT_EQ(carry.lastWasWrite, isRead ? 0 : 1) << states;
+        EXPECT_EQ(carry.bitOrder, format) << states;
+        EXPECT_EQ(carry.active, active) << states;
+        EXPECT_EQ(opened.position(), active && !wasRead && !goesOn ? 1 : 0) << states;
     }
 }
 
-TEST(CarryByte, ByteTransfersSettleTheBits) {
+TEST(CarryByte, BitsThatCannotBeSettledStay) {
     const TempFile file("\xFF\xFF");
-    OpenedFile opened(file.path(), "r+");
+    OpenedFile opened(file.path());
     CarryByte& carry = opened.stream.getCarryByte();
+    EXPECT_TRUE(carry.CheckCarryByte(0, littleEndian, true));
     setCarry(carry, false, littleEndian, 0, 4);
-    EXPECT_TRUE(carry.CheckCarryByte(0, littleEndian, true));
-    EXPECT_FALSE(carry.active);
-    EXPECT_TRUE(carry.CheckCarryByte(0, littleEndian, true));
-    opened.stream.flush();
-    EXPECT_EQ(file.content(), "\xF0\xFF");
-
-    OpenedFile readOnly(file.path());
-    CarryByte& stuck = readOnly.stream.getCarryByte();
-    setCarry(stuck, false, littleEndian, 0, 4);
-    EXPECT_FALSE(stuck.CheckCarryByte(0, littleEndian, true));
-    EXPECT_TRUE(stuck.active);
-    EXPECT_FALSE(stuck.CheckCarryByte(1, littleEndian, true));
-    EXPECT_EQ(stuck.FseekHandleCarryByte(), 1);
+    EXPECT_FALSE(carry.CheckCarryByte(0, littleEndian, true));
+    EXPECT_FALSE(carry.CheckCarryByte(1, littleEndian, true));
+    EXPECT_EQ(carry.FseekHandleCarryByte(), 1);
+    EXPECT_TRUE(carry.active);
     // The direction is forced: bits that were read are written as well.
-    setCarry(stuck, true, littleEndian, 0, 4);
-    EXPECT_EQ(stuck.WriteCarryByte(), 0);
-    EXPECT_EQ(stuck.fiPkWriteCarryByte(), 1);
+    setCarry(carry, true, littleEndian, 0, 4);
+    EXPECT_EQ(carry.WriteCarryByte(), 0);
+    EXPECT_EQ(carry.fiPkWriteCarryByte(), 1);
 }
 
 TEST(CarryByte, SeeksStartAtThePartlyUsedByte) {
@@ -122,15 +108,10 @@ TEST(CarryByte, SeeksStartAtThePartlyUsedByte) {
     opened.stream.setPosition(1);
     setCarry(carry, false, bigEndian, 0, 4);
     EXPECT_EQ(carry.FseekHandleCarryByte(), 0);
-    EXPECT_EQ(opened.position(), 1);
-    EXPECT_TRUE(carry.active);
-    EXPECT_EQ(carry.pendingBits, 0);
     EXPECT_EQ(opened.read(2), "\x0F\xFF");
-
     setCarry(carry, true, bigEndian, 0, 4);
     EXPECT_EQ(carry.FseekHandleCarryByte(), 0);
     EXPECT_EQ(opened.position(), 3);
-    EXPECT_EQ(carry.pendingBits, 0);
 
     FaultyFile pipe{.bytes = "", .failingSeek = 1, .error = ESPIPE};
     OpenedFile unseekable(pipe.open("w"), "w");

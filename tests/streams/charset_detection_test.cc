@@ -17,14 +17,8 @@ using support::TempFile;
 
 // Text that is told from Latin-1 and UTF-8 by its bytes alone.
 const std::string byteOrderMark = "\xFE\xFF\0a\0b\0c"s;
-const std::string frenchLatin1 =
-    "Il a \xE9t\xE9 d\xE9"
-    "cid\xE9 que la premi\xE8re le\xE7on serait donn\xE9"
-    "e \xE0 l'\xE9"
-    "cole.";
-const std::string frenchUtf8 =
-    "Il a \xC3\xA9t\xC3\xA9 d\xC3\xA9"
-    "cid\xC3\xA9 que la premi\xC3\xA8re le\xC3\xA7on.";
+const std::string frenchLatin1 = "Il a \351t\351 d\351cid\351 que la premi\350re le\347on";
+const std::string frenchUtf8 = "Il a \303\251t\303\251 d\303\251cid\303\251 que la le\303\247on";
 
 TEST(CharsetDetection, ExaminesTheRestOfTheFile) {
     const struct {

@@ -160,10 +160,8 @@ TEST_F(ConsoleStreams, RefuseTheRest) {
     screenStreamBase base(stdout, permission);
     OutputBuffer buffer(vxUINT8_CLASS, 0, 0, 0);
     OutputBuffer line(vxCHAR_CLASS, 0, 0, 0);
-    char byte = 0;
     int status = 5;
     bool flag = false;
-    long size = 0;
     const struct {
         int line;
         std::function<void()> call;
@@ -174,14 +172,10 @@ TEST_F(ConsoleStreams, RefuseTheRest) {
         {__LINE__, [&] { base.flush(); }},
         {__LINE__, [&] { base.setBufferSize(1); }},
         {__LINE__, [&] { out.getByte(); }},
-        {__LINE__, [&] { out.getFileSize(size); }},
-        {__LINE__, [&] { out.GetNElements(1, &byte, 1); }},
         {__LINE__, [&] { out.GetNElements(1, buffer, 1); }},
         {__LINE__, [&] { out.GetLine(-1, line); }},
         {__LINE__, [&] { out.Rewind(1); }},
         {__LINE__, [&] { err.scanOctal(-1, status, flag); }},
-        {__LINE__, [&] { err.scanHex(-1, status, flag); }},
-        {__LINE__, [&] { err.scanUnsignedInteger(-1, status, flag); }},
         {__LINE__, [&] { err.scanInteger(-1, status); }},
         {__LINE__, [&] { err.scanIntegerCouldBeHex(-1, status); }},
         {__LINE__, [&] { err.scanFloat(-1, status); }},
