@@ -1,13 +1,15 @@
 #include "tests/support/memory_file.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <utility>
 
 namespace support {
 
 MemoryFile::MemoryFile(std::string content, Kind kind, std::size_t bufferSize)
     : bytes(std::move(content)), buffer(std::max<std::size_t>(bufferSize, 1), '\0') {
-    const cookie_io_functions_t calls = {read, nullptr, kind == Seekable ? seek : nullptr, nullptr};
+    const auto seeker = kind == Seekable ? seek : refuseToSeek;
+    const cookie_io_functions_t calls = {read, nullptr, seeker, nullptr};
     file = fopencookie(this, "r", calls);
     std::setvbuf(file, buffer.data(), _IOFBF, buffer.size());
 }
@@ -33,6 +35,11 @@ int MemoryFile::seek(void* self, off64_t* position, int whence) {
     *position = target;
     it.offset = static_cast<std::size_t>(target);
     return 0;
+}
+
+int MemoryFile::refuseToSeek(void*, off64_t*, int) {
+    errno = ESPIPE;
+    return -1;
 }
 
 std::string readRest(std::FILE* file) {

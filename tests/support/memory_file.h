@@ -21,6 +21,7 @@ public:
 private:
     static ssize_t read(void* self, char* buffer, std::size_t size);
     static int seek(void* self, off64_t* offset, int whence);
+    static int refuseToSeek(void* self, off64_t* offset, int whence);
 
     std::string bytes;
     std::size_t offset = 0;
