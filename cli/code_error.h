@@ -1,17 +1,10 @@
 #pragma once
 
-#include <stdexcept>
-#include <string>
+#include "embedded/builtins/code_error.h"
 
 namespace cli {
 
 // A numeric code (errno values included) that ends a verb. The text says where it happened.
-class CodeError : public std::runtime_error {
-public:
-    CodeError(int numericCode, const std::string& place)
-        : std::runtime_error(place), code(numericCode) {}
-
-    const int code;
-};
+using CodeError = Orvandeil::FileIO::embedded::CodeError;
 
 }  // namespace cli

@@ -1,27 +1,23 @@
 #include "cli/print_target.h"
 
-#include "cli/code_error.h"
-#include "fileio/attributes/file_permission.h"
-#include "fileio/errors/code_list.h"
+#include "cli/files.h"
+#include "embedded/builtins/print.h"
 #include "fileio/host/memory.h"
-#include "fileio/host/text.h"
-#include "fileio/text/output_screen_stream.h"
 #include "fileio/text/output_string_stream.h"
 
 #include <algorithm>
 #include <array>
-#include <cerrno>
-#include <cstdio>
 #include <cstring>
 #include <string>
+#include <utility>
 
 namespace cli {
 
-using Orvandeil::FileIO::FilePermission;
-using Orvandeil::FileIO::outputScreenStream;
 using Orvandeil::FileIO::outputStringStream;
 using Orvandeil::FileIO::TcodnStream;
-namespace code = Orvandeil::FileIO::code;
+namespace embedded = Orvandeil::FileIO::embedded;
+using embedded::Failure;
+using embedded::OpenFile;
 
 namespace {
 
@@ -92,14 +88,14 @@ public:
 
     TcodnStream& stream() override { return text; }
 
-    int close() override {
+    std::optional<Failure> close() override {
         const WrittenBytes bytes(text);
         UConverter* const converter = text.GetConv(0);
         report.key("bytes", bytes.view().size());
         report.key("hex", hexadecimal(bytes.view()));
         report.key("text", holdsUnits(converter) ? std::u16string(bytes.units())
                                                  : decoded(bytes.view(), converter));
-        return 0;
+        return std::nullopt;
     }
 
 private:
@@ -107,67 +103,33 @@ private:
     Report& report;
 };
 
-class ConsoleTarget : public PrintTarget {
-public:
-    TcodnStream& stream() override { return screen; }
-
-    int close() override {
-        errno = 0;
-        const bool delivered = screen.flush() == 1;
-        if (delivered) return 0;
-        return errno != 0 ? errno : code::FlushError;
-    }
-
-private:
-    FilePermission permission{"w", false};
-    outputScreenStream screen{stdout, permission};
-};
-
 class FileTarget : public PrintTarget {
 public:
-    FileTarget(const std::string& path, const FilePermission& permission,
-               const std::string& encoding)
-        : text(encoding.empty() ? "UTF-8" : encoding),
-          file(std::fopen(path.c_str(), permission.fileSystemFormat)) {
-        if (!file) throw CodeError(errno, path);
-    }
+    explicit FileTarget(std::unique_ptr<OpenFile> opened)
+        : file(std::move(opened)), output(embedded::beginPrint(*file)) {}
 
-    TcodnStream& stream() override { return text; }
+    TcodnStream& stream() override { return output; }
 
-    int close() override {
-        const WrittenBytes bytes(text);
-        errno = 0;
-        const std::string_view content = bytes.view();  // null when nothing was written
-        const bool complete = content.empty() || std::fwrite(content.data(), 1, content.size(),
-                                                             file.get()) == content.size();
-        const bool closed = std::fclose(file.release()) == 0;
-        if (complete && closed) return 0;
-        return errno != 0 ? errno : code::FlushError;
-    }
+    std::optional<Failure> close() override { return embedded::closeFile(std::move(file)); }
 
 private:
-    struct Close {
-        void operator()(std::FILE* open) const noexcept { std::fclose(open); }
-    };
-    outputStringStream text;
-    std::unique_ptr<std::FILE, Close> file;
+    std::unique_ptr<OpenFile> file;
+    TcodnStream& output;
 };
 
-std::unique_ptr<PrintTarget> openFile(const CommandLine& line, const std::string& encoding) {
+std::unique_ptr<OpenFile> openFile(const CommandLine& line) {
     const std::string path(*line.value("output"));
-    const FilePermission permission(std::string(line.valueOr("mode", "w")).c_str(), false);
-    permission.Validate();
-    if (permission.read && !permission.update) throw CodeError(code::IsOpenRead, path);
-    return std::make_unique<FileTarget>(path, permission, encoding);
+    return embedded::openFile(path, outputRequest(path, line));
 }
 
 }  // namespace
 
 std::unique_ptr<PrintTarget> openPrintTarget(const CommandLine& line, Report& report) {
-    const std::string encoding(line.valueOr("encoding", ""));
-    if (line.has("output")) return openFile(line, encoding);
-    if (report.isJson()) return std::make_unique<JsonTarget>(encoding, report);
-    return std::make_unique<ConsoleTarget>();
+    if (line.has("output")) return std::make_unique<FileTarget>(openFile(line));
+    if (report.isJson()) {
+        return std::make_unique<JsonTarget>(std::string(line.valueOr("encoding", "")), report);
+    }
+    return std::make_unique<FileTarget>(embedded::openConsole());
 }
 
 }  // namespace cli

@@ -2,9 +2,11 @@
 
 #include "cli/command_line.h"
 #include "cli/report.h"
+#include "embedded/builtins/code_error.h"
 #include "fileio/text/tcodn_stream.h"
 
 #include <memory>
+#include <optional>
 
 namespace cli {
 
@@ -14,8 +16,8 @@ public:
     virtual ~PrintTarget() = default;
 
     virtual Orvandeil::FileIO::TcodnStream& stream() = 0;
-    // Delivers everything that was written to the stream. 0, or the code of the failure.
-    virtual int close() = 0;
+    // Delivers everything that was written to the stream.
+    virtual std::optional<Orvandeil::FileIO::embedded::Failure> close() = 0;
 };
 
 // By the options `output`, `mode`, `encoding` and `json`. A file that cannot be opened for writing

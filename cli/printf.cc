@@ -54,6 +54,12 @@ void tellFailure(const std::u16string& format, const printfController& controlle
     }
 }
 
+// A short write without a cause of its own is better told by what closing the output meets.
+bool hasOwnCause(const printfController& controller) {
+    const int status = controller.getErrorCode();
+    return status != 0 && status != code::NotEnoughArgs;
+}
+
 void tellRaised(const std::exception_ptr& raised, const std::string& place, Report& report) {
     try {
         std::rethrow_exception(raised);
@@ -81,15 +87,15 @@ void runPrintf(const CommandLine& line, Report& report) {
     } catch (const IMsgIDException&) {
         raised = std::current_exception();
     }
-    // Whatever happened, what was written before it stays written. A failure without a code
-    // is explained by that of the target, where there is one.
-    const int closeFailure = target->close();
+    // Whatever happened, what was written before it stays written.
+    const auto closeFailure = target->close();
     if (raised) {
         tellRaised(raised, piecePlace(format, controller.getCurrentPiece()), report);
-    } else if (!complete && (controller.getErrorCode() != 0 || closeFailure == 0)) {
+    } else if (closeFailure && !hasOwnCause(controller)) {
+        report.fail(closeFailure->code, closeFailure->place);
+    } else if (!complete) {
         tellFailure(format, controller, report);
     }
-    if (closeFailure != 0) report.fail(closeFailure, line.valueOr("output", "standard output"));
 }
 
 constexpr Option options[] = {

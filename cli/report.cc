@@ -63,7 +63,8 @@ int Report::finish() {
         print(json.finish());
     }
     flush();
-    if (outputError != 0) fail(outputError, "standard output");
+    // What failed first has been told; often it was this output.
+    if (outputError != 0 && !failed) fail(outputError, "standard output");
     return failed ? exitFailed : exitDone;
 }
 

@@ -25,6 +25,10 @@ struct Verb {
 inline constexpr std::size_t anyNumber = static_cast<std::size_t>(-1);
 
 extern const Verb printfVerb;
+extern const Verb readVerb;
+extern const Verb writeVerb;
+extern const Verb linesVerb;
+extern const Verb charsetVerb;
 extern const Verb convertVerb;
 extern const Verb explainVerb;
 

@@ -1,0 +1,162 @@
+#include "embedded/builtins/bit_transfer.h"
+
+#include "embedded/services/array.h"
+#include "embedded/services/element_types.h"
+#include "fileio/constants.h"
+
+#include <algorithm>
+#include <type_traits>
+#include <vector>
+
+namespace Orvandeil::FileIO::embedded {
+namespace {
+
+// The bytes of a run of fields, the carry byte first and room for the last field's reach behind.
+class Run {
+public:
+    Run(const FieldLayout& fieldLayout, unsigned long count)
+        : layout(fieldLayout),
+          fieldsAtOnce(std::min(count, constants::transferPieceBytes * 8 / stride())),
+          bytes(1 + (fieldsAtOnce * stride() + 7) / 8 + fieldReach) {}
+
+    unsigned long stride() const { return static_cast<unsigned long>(layout.stride); }
+
+    FieldLayout layout;
+    unsigned long fieldsAtOnce;
+    std::vector<unsigned char> bytes;
+};
+
+template <class T>
+void unpack(const Run& run, std::size_t place, unsigned long count, void* target) {
+    auto* out = static_cast<T*>(target);
+    for (unsigned long i = 0; i < count; ++i, place += run.stride()) {
+        const std::uint64_t field = loadField(run.bytes.data(), place, run.layout);
+        if constexpr (std::is_signed_v<T>) {
+            out[i] = static_cast<T>(signExtended(field, run.layout.bits));
+        } else {
+            out[i] = static_cast<T>(field);
+        }
+    }
+}
+
+template <class T>
+std::uint64_t saturated(T value, int bits) {
+    if constexpr (std::is_signed_v<T>) {
+        return static_cast<std::uint64_t>(
+            std::clamp<std::int64_t>(value, lowestSigned(bits), highestSigned(bits)));
+    } else {
+        return std::min<std::uint64_t>(value, highestUnsigned(bits));
+    }
+}
+
+template <class T>
+void pack(Run& run, std::size_t place, unsigned long count, const void* source) {
+    const auto* const values = static_cast<const T*>(source);
+    for (unsigned long i = 0; i < count; ++i, place += run.stride())
+        storeField(run.bytes.data(), place, run.layout, saturated(values[i], run.layout.bits));
+}
+
+// Calls apply.operator()<T>() with the element type of an integer class.
+template <class Apply>
+void withIntegerType(vxClassID classID, Apply apply) {
+    const auto known = [&apply]<class T>(ElementType<T>) {
+        if constexpr (std::is_integral_v<T>) apply.template operator()<T>();
+    };
+    withElementType(classID, known, [] {});
+}
+
+void keepRest(CarryByte& carry, const Run& run, std::size_t end) {
+    const auto used = static_cast<int>(end % 8);
+    carry.pendingBits = used == 0 ? 0 : 8 - used;
+    carry.carryValue = used == 0 ? 0 : bitsFrom(run.bytes[end / 8], used, run.layout.bigEndian);
+}
+
+void dropBits(CarryByte& carry) {
+    carry.pendingBits = 0;
+    carry.carryValue = 0;
+}
+
+// One piece of a read, in a run that has room for it.
+unsigned long readPiece(OpenFile& file, Run& run, unsigned long count, OutputBuffer& buffer) {
+    CarryByte& carry = file.carry();
+    const auto pending = static_cast<unsigned long>(carry.pendingBits);
+    const unsigned long bits = count * run.stride();
+    const unsigned long needed = bits <= pending ? 0 : (bits - pending + 7) / 8;
+    run.bytes[0] = carry.carryValue;
+    auto* const rest = reinterpret_cast<char*>(run.bytes.data() + 1);
+    const unsigned long got = needed == 0 ? 0 : file.stream->GetNElements(needed, rest, 1);
+    const unsigned long whole = std::min(count, (pending + 8 * got) / run.stride());
+    const std::size_t start = 8 - pending;
+    std::size_t room = whole;
+    void* const target = buffer.Allocate(room);
+    withIntegerType(buffer.GetClassID(), [&]<class T>() { unpack<T>(run, start, whole, target); });
+    if (whole == count) {
+        keepRest(carry, run, start + bits);
+    } else {
+        dropBits(carry);
+    }
+    return whole;
+}
+
+unsigned long writePiece(OpenFile& file, Run& run, unsigned long count, vxClassID classID,
+                         const void* values) {
+    CarryByte& carry = file.carry();
+    const auto pending = static_cast<unsigned long>(carry.pendingBits);
+    std::ranges::fill(run.bytes, 0);
+    run.bytes[0] = carry.carryValue;
+    withIntegerType(classID, [&]<class T>() { pack<T>(run, pending, count, values); });
+    const unsigned long end = pending + count * run.stride();
+    const unsigned long whole = end / 8;
+    const unsigned long out =
+        whole == 0 ? 0 : file.stream->PutNElements(whole, run.bytes.data(), 1);
+    if (out < whole) {
+        dropBits(carry);
+        return 8 * out <= pending ? 0 : (8 * out - pending) / run.stride();
+    }
+    carry.pendingBits = static_cast<int>(end % 8);
+    carry.carryValue = run.bytes[whole];
+    return count;
+}
+
+// Calls piece(fields done, fields wanted) until `count` fields are done or one comes up short.
+template <class Piece>
+unsigned long inPieces(unsigned long count, const Run& run, Piece piece) {
+    unsigned long done = 0;
+    unsigned long wanted = 0;
+    unsigned long moved = 0;
+    while (done < count && moved == wanted) {
+        wanted = std::min(count - done, run.fieldsAtOnce);
+        moved = piece(done, wanted);
+        done += moved;
+    }
+    return done;
+}
+
+}  // namespace
+
+unsigned long readFields(OpenFile& file, const FieldLayout& layout, unsigned long count,
+                         OutputBuffer& buffer) {
+    Run run(layout, count);
+    return inPieces(count, run, [&](unsigned long, unsigned long wanted) {
+        return readPiece(file, run, wanted, buffer);
+    });
+}
+
+unsigned long writeFields(OpenFile& file, const FieldLayout& layout, unsigned long count,
+                          vxClassID classID, const void* values) {
+    Run run(layout, count);
+    const std::size_t size = elementBytes(classID);
+    return inPieces(count, run, [&](unsigned long done, unsigned long wanted) {
+        const char* const from = static_cast<const char*>(values) + done * size;
+        return writePiece(file, run, wanted, classID, from);
+    });
+}
+
+bool alignFields(OpenFile& file) {
+    CarryByte& carry = file.carry();
+    const bool settled = carry.WriteCarryByte() == 0;
+    if (settled) dropBits(carry);
+    return settled;
+}
+
+}  // namespace Orvandeil::FileIO::embedded

@@ -1,0 +1,125 @@
+#include "embedded/builtins/open_close.h"
+
+#include "embedded/builtins/spool.h"
+#include "fileio/errors/code_list.h"
+#include "fileio/host/text.h"
+#include "fileio/text/output_screen_stream.h"
+#include "fileio/text/output_string_stream.h"
+#include "fileio/text/std_err_stream.h"
+
+#include <cerrno>
+#include <utility>
+
+#include <sys/stat.h>
+
+namespace Orvandeil::FileIO::embedded {
+namespace {
+
+FilePermission validPermission(const std::string& text) {
+    FilePermission permission(text.c_str(), false);
+    permission.Validate();
+    return permission;
+}
+
+MachineFormat validFormat(const std::string& name) {
+    MachineFormat format(name.c_str());
+    format.Validate();
+    return format;
+}
+
+// Raises what a stream of the encoding raises, while there is no file yet that could be emptied.
+void checkEncoding(const std::string& encoding) {
+    if (!encoding.empty()) const outputStringStream probe(encoding);
+}
+
+void refuseDirectory(const OpenFile& file) {
+    struct stat status = {};
+    if (fstat(fileno(file.handle.get()), &status) != 0) throw CodeError(file.failure(errno));
+    if (S_ISDIR(status.st_mode)) throw CodeError(file.failure(EISDIR));
+}
+
+// `path` is where the file can be opened a second time.
+std::unique_ptr<OpenFile> withFileStream(std::unique_ptr<OpenFile> file,
+                                         const std::string& encoding, const std::string& path) {
+    file->stream = std::make_unique<fileStream>(file->handle.get(), encoding, file->permission,
+                                                vxTextFromNarrow(path.data(), path.size()));
+    return file;
+}
+
+template <class Console>
+std::unique_ptr<OpenFile> makeConsole(const char* label, std::FILE* standardFile) {
+    auto file = std::make_unique<OpenFile>(label, FileHandle(standardFile), validPermission("w"),
+                                           MachineFormat());
+    file->stream = std::make_unique<Console>(standardFile, file->permission);
+    return file;
+}
+
+}  // namespace
+
+std::unique_ptr<OpenFile> openFile(const std::string& name, const OpenRequest& request) {
+    const FilePermission permission = validPermission(request.permission);
+    const MachineFormat format = validFormat(request.machineFormat);
+    checkEncoding(request.encoding);
+    errno = 0;
+    FileHandle handle(std::fopen(name.c_str(), permission.fileSystemFormat));
+    if (!handle) throw CodeError(errno, name);
+    auto file = std::make_unique<OpenFile>(name, std::move(handle), permission, format);
+    refuseDirectory(*file);
+    file = withFileStream(std::move(file), request.encoding, name);
+    // An emptied file shows its encoding now. Later, what is written first could be taken for it.
+    if (permission.write) file->stream->GetConv(0);
+    return file;
+}
+
+std::unique_ptr<OpenFile> openStandardInput(const std::string& encoding) {
+    checkEncoding(encoding);
+    auto file = std::make_unique<OpenFile>("standard input", FileHandle(stdin), FilePermission(),
+                                           MachineFormat());
+    refuseDirectory(*file);
+    if (fseeko(stdin, 0, SEEK_CUR) != 0) file->handle = spool(stdin, file->label);
+    const std::string path = "/dev/fd/" + std::to_string(fileno(file->handle.get()));
+    return withFileStream(std::move(file), encoding, path);
+}
+
+std::unique_ptr<OpenFile> openStandardOutput(const std::string& encoding) {
+    auto file = std::make_unique<OpenFile>("standard output", FileHandle(stdout),
+                                           validPermission("w"), MachineFormat());
+    // Nothing is there to be detected.
+    return withFileStream(std::move(file), encoding.empty() ? "UTF-8" : encoding, "");
+}
+
+std::unique_ptr<OpenFile> openConsole() {
+    return makeConsole<outputScreenStream>("standard output", stdout);
+}
+
+std::unique_ptr<OpenFile> openErrorConsole() {
+    return makeConsole<stdErrStream>("standard error", stderr);
+}
+
+std::optional<Failure> flushBuffers(OpenFile& file) {
+    errno = 0;
+    // On a console success is not 0.
+    const bool done = (file.stream->flush() == 0) != file.stream->isScreen();
+    if (done) return std::nullopt;
+    return systemFailure(file, code::FlushError);
+}
+
+std::optional<Failure> flushFile(OpenFile& file) {
+    const bool settled = file.carry().FlushAndResetCarryByte() == 0;
+    const std::optional<Failure> carry = settled ? std::nullopt : std::optional(carryFailure(file));
+    const std::optional<Failure> buffers = flushBuffers(file);
+    return carry ? carry : buffers;
+}
+
+std::optional<Failure> closeFile(std::unique_ptr<OpenFile> file) {
+    std::optional<Failure> failure = flushFile(*file);
+    file->stream.reset();
+    std::FILE* const handle = file->handle.get();
+    if (handle == stdin || handle == stdout || handle == stderr) return failure;
+    errno = 0;
+    const bool closed = std::fclose(file->handle.release()) == 0;
+    if (!closed && !failure) failure = systemFailure(*file, code::FlushError);
+    return failure;
+}
+
+}  // namespace Orvandeil::FileIO::embedded

@@ -1,0 +1,67 @@
+#include "embedded/builtins/open_file.h"
+
+#include "fileio/errors/code_list.h"
+#include "fileio/errors/fi_error.h"
+#include "fileio/host/text.h"
+
+#include <cerrno>
+#include <utility>
+
+namespace Orvandeil::FileIO::embedded {
+namespace {
+
+void begin(OpenFile& file, Direction direction, int isBitTransfer, int dataSizeType) {
+    const bool isRead = direction == Direction::Reading;
+    if (!file.carry().CheckCarryByte(isBitTransfer, dataSizeType, isRead)) {
+        throw CodeError(carryFailure(file));
+    }
+    if (isBitTransfer != 0) file.carry().active = true;
+    const Direction before = std::exchange(file.direction, direction);
+    if (before == Direction::None || before == direction || file.stream->isScreen()) return;
+    if (fseeko(file.handle.get(), 0, SEEK_CUR) != 0) {
+        throw CodeError(file.failure(code::FseekFailed));
+    }
+}
+
+}  // namespace
+
+void FileCloser::operator()(std::FILE* file) const noexcept {
+    if (file != stdin && file != stdout && file != stderr) std::fclose(file);
+}
+
+OpenFile::OpenFile(std::string name, FileHandle openHandle, const FilePermission& openedWith,
+                   const MachineFormat& defaultFormat)
+    : label(std::move(name)),
+      permission(openedWith),
+      format(defaultFormat),
+      handle(std::move(openHandle)) {}
+
+void requireReadable(const OpenFile& file) {
+    if (file.permission.read || file.permission.update) return;
+    throw CodeError(file.failure(code::IsOpenWrite));
+}
+
+void requireWritable(const OpenFile& file) {
+    if (!file.permission.read || file.permission.update) return;
+    throw CodeError(file.failure(code::IsOpenRead));
+}
+
+void beginTransfer(OpenFile& file, Direction direction) {
+    begin(file, direction, 0, file.format.dataSizeType);
+}
+
+void beginBitTransfer(OpenFile& file, Direction direction, int dataSizeType) {
+    begin(file, direction, 1, dataSizeType);
+}
+
+Failure carryFailure(const OpenFile& file) {
+    const std::u16string cause = fiPkStrerror(file.stream->getErrorCode());
+    const std::string text = vxTextToNarrow(cause.data(), cause.size());
+    return {code::WriteCarryByteFailed, text.empty() ? file.label : file.label + ": " + text};
+}
+
+Failure systemFailure(const OpenFile& file, int otherwise) {
+    return file.failure(errno != 0 ? errno : otherwise);
+}
+
+}  // namespace Orvandeil::FileIO::embedded
