@@ -1,7 +1,7 @@
 #include "cli/explain.h"
 #include "cli/format_argument.h"
 #include "cli/format_place.h"
-#include "fileio/printf/fout_format_piece.h"
+#include "fileio/printf/fout_format_pieces.h"
 #include "fileio/printf/print_format_parser.h"
 
 #include <array>
@@ -83,7 +83,7 @@ std::string quoted(std::u16string_view text) {
 void writePiece(JsonWriter& json, const foutFormatPiece& piece) {
     json.startObject();
     if (piece.getConversion() == NoConversion) {
-        json.key("literal").value(piece.getLiteralText());
+        json.key("literal").value(literalTextOf(piece));
     } else {
         json.key("conversion").value(static_cast<int>(piece.getConversion()));
         json.key("subformat").value(static_cast<int>(piece.getSubformat()));
@@ -121,7 +121,7 @@ void explainAsJson(PrintFormatParser& parser, Report& report) {
 void explainInWords(const std::u16string& format, PrintFormatParser& parser, Report& report) {
     forEachPiece(parser, [&](const foutFormatPiece& piece) {
         const bool isLiteral = piece.getConversion() == NoConversion;
-        report.print(isLiteral ? "prints " + quoted(piece.getLiteralText()) + '\n'
+        report.print(isLiteral ? "prints " + quoted(literalTextOf(piece)) + '\n'
                                : pieceText(format, piece) + "  " + conversionWords(piece) + '\n');
     });
     if (parser.getRecordedError() == 0) return;

@@ -1,7 +1,7 @@
 #include "cli/format_place.h"
 
 #include "fileio/host/text.h"
-#include "fileio/printf/fout_format_piece.h"
+#include "fileio/printf/fout_format_pieces.h"
 #include "fileio/printf/print_format_parser.h"
 
 #include <algorithm>
@@ -42,7 +42,7 @@ std::size_t endOf(std::u16string_view format, const foutFormatPiece& piece) {
     if (piece.getConversion() != Orvandeil::FileIO::NoConversion) {
         return format.find(u'%', position + 1);
     }
-    return piece.getLiteralText() == u"%" ? position + 2 : position;
+    return literalTextOf(piece) == u"%" ? position + 2 : position;
 }
 
 }  // namespace

@@ -91,10 +91,13 @@ public:
     std::optional<Failure> close() override {
         const WrittenBytes bytes(text);
         UConverter* const converter = text.GetConv(0);
+        // All of it before the first key: memory may not suffice, and an object stays whole.
+        const std::string hex = hexadecimal(bytes.view());
+        const std::u16string units = holdsUnits(converter) ? std::u16string(bytes.units())
+                                                           : decoded(bytes.view(), converter);
         report.key("bytes", bytes.view().size());
-        report.key("hex", hexadecimal(bytes.view()));
-        report.key("text", holdsUnits(converter) ? std::u16string(bytes.units())
-                                                 : decoded(bytes.view(), converter));
+        report.key("hex", hex);
+        report.key("text", units);
         return std::nullopt;
     }
 

@@ -8,6 +8,7 @@
 #include "fileio/printf/printf_controller.h"
 
 #include <exception>
+#include <optional>
 #include <string>
 #include <utility>
 
@@ -78,23 +79,25 @@ void runPrintf(const CommandLine& line, Report& report) {
         readFormat(line.operands()[0], line.has("raw"), line.has("strict-escapes"));
 
     const auto target = openPrintTarget(line, report);
-    printfController controller(format, &target->stream(), arrays.data(),
-                                static_cast<int>(arrays.size()));
+    std::optional<printfController> controller;
     bool complete = false;
     std::exception_ptr raised;
     try {
-        complete = controller.doPrintf();
-    } catch (const IMsgIDException&) {
+        controller.emplace(format, &target->stream(), arrays.data(),
+                           static_cast<int>(arrays.size()));
+        complete = controller->doPrintf();
+    } catch (...) {
         raised = std::current_exception();
     }
     // Whatever happened, what was written before it stays written.
     const auto closeFailure = target->close();
     if (raised) {
-        tellRaised(raised, piecePlace(format, controller.getCurrentPiece()), report);
-    } else if (closeFailure && !hasOwnCause(controller)) {
+        const auto* piece = controller ? controller->getCurrentPiece() : nullptr;
+        tellRaised(raised, piecePlace(format, piece), report);
+    } else if (closeFailure && !hasOwnCause(*controller)) {
         report.fail(closeFailure->code, closeFailure->place);
     } else if (!complete) {
-        tellFailure(format, controller, report);
+        tellFailure(format, *controller, report);
     }
 }
 

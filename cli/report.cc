@@ -1,5 +1,6 @@
 #include "cli/report.h"
 
+#include "embedded/services/memory.h"
 #include "fileio/errors/fi_error.h"
 
 #include <algorithm>
@@ -42,6 +43,10 @@ void Report::fail(int failure, std::string_view place) {
 }
 
 void Report::fail(const IMsgIDException& error, std::string_view place) {
+    // The host's exhausted memory and the library's are the same to a user.
+    if (dynamic_cast<const embedded::OutOfMemoryError*>(&error) != nullptr) {
+        return fail(Orvandeil::FileIO::code::NoMemory, place);
+    }
     failed = true;
     identifier = error.GetID();
     tell(error.what(), place);

@@ -15,6 +15,8 @@ inline constexpr std::size_t converterPieceBytes = 48;
 inline constexpr std::size_t firstOutputBlockBytes = 1024;
 // Stack space tried before a formatted number gets a block of its own.
 inline constexpr std::size_t numberScratchBytes = 8;
+// Block that a longer formatted text passes through.
+inline constexpr std::size_t formatPieceBytes = 16;
 // Pad characters written at once.
 inline constexpr std::size_t paddingBlockUnits = 3;
 // The largest chunk, in bytes, that a buffer opens beyond what it was asked for.
@@ -24,6 +26,7 @@ inline constexpr std::size_t transferPieceBytes = 1048576;
 inline constexpr std::size_t converterPieceBytes = 0x3FFFFFFF;
 inline constexpr std::size_t firstOutputBlockBytes = 1024;
 inline constexpr std::size_t numberScratchBytes = 512;
+inline constexpr std::size_t formatPieceBytes = 65536;
 inline constexpr std::size_t paddingBlockUnits = 256;
 inline constexpr std::size_t reservedChunkBytes = 65536;
 #endif

@@ -67,7 +67,7 @@ FILEIO_API const char* nameOfClass(vxClassID classID);
 FILEIO_API const vxArray* cellContent(const vxArray& cell);
 FILEIO_API const vxArray* structField(const vxArray& structure, std::string_view name);
 
-// A numeric class and its C++ element type: one-row arrays from values of it.
+// A row of values, whose type must be the element type of the class.
 template <class T>
 ArrayPtr makeRow(vxClassID classID, std::initializer_list<T> values) {
     ArrayPtr array = makeNumeric(classID, {values.size() == 0 ? 0u : 1u, values.size()});

@@ -4,6 +4,7 @@
 #include "fileio/host/memory.h"
 
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -23,5 +24,6 @@ struct vxArray {
     std::vector<Orvandeil::FileIO::embedded::StringElement> texts;
     std::vector<Orvandeil::FileIO::embedded::ArrayPtr> contents;  // of a cell, or by field
     std::vector<std::string> fields;
-    Orvandeil::FileIO::embedded::FunctionTable functions;
+    // Of an object that was made with them; it then answers by nothing else.
+    std::optional<Orvandeil::FileIO::embedded::FunctionTable> functions;
 };

@@ -154,7 +154,7 @@ ArrayPtr callOwn(const FunctionTable& table, std::string_view name, Inputs input
 ArrayPtr callFunction(std::string_view name, Inputs inputs) {
     if (inputs.empty()) return nullptr;
     const vxArray& first = *inputs[0];
-    if (!first.functions.empty()) return callOwn(first.functions, name, inputs);
+    if (first.functions) return callOwn(*first.functions, name, inputs);
     for (const Entry& entry : functions) {
         const bool ofClass = entry.className.empty() || entry.className == first.className;
         if (entry.function == name && ofClass) return entry.run(inputs);
@@ -171,8 +171,7 @@ vxArray* vxDispatchCall(const char* name, const vxArray* const* inputs, std::siz
 }
 
 bool vxStringArrayIs(const vxArray* array) {
-    return array->classID == vxOBJECT_CLASS && array->className == "string" &&
-           array->functions.empty();
+    return array->classID == vxOBJECT_CLASS && array->className == "string" && !array->functions;
 }
 
 bool vxStringArrayIsMissing(const vxArray* array, std::size_t index) {

@@ -3,6 +3,7 @@
 #include "fileio/errors/identifiers.h"
 #include "fileio/host/text.h"
 
+#include <algorithm>
 #include <cstdio>
 
 #include <boost/exception_ptr.hpp>
@@ -101,7 +102,10 @@ void vxWarningMsgId(const BaseMsgID& id) {
         recorder->record(id);
         return;
     }
-    const std::string line =
-        "fileio: warning: " + id.GetIdentifier() + ": " + narrowMessage(id) + '\n';
+    std::string line = "fileio: warning: " + id.GetIdentifier() + ": " + narrowMessage(id);
+    // Arguments may hold anything, and a warning is one line.
+    std::ranges::replace_if(
+        line, [](char c) { return static_cast<unsigned char>(c) < ' ' || c == '\x7F'; }, ' ');
+    line += '\n';
     std::fputs(line.c_str(), stderr);
 }

@@ -1,11 +1,12 @@
 #pragma once
 
 #include "fileio/host/arrays.h"
+#include "fileio/host/memory.h"
 
+#include <algorithm>
 #include <cstddef>
-#include <functional>
 #include <memory>
-#include <numeric>
+#include <span>
 
 namespace Orvandeil::FileIO::detail {
 
@@ -21,11 +22,20 @@ constexpr bool isNumericClass(vxClassID classID) {
     return classID >= vxDOUBLE_CLASS && classID <= vxUINT64_CLASS;
 }
 
-// The number of elements of a host array that is no object: the product of its lengths.
+// The product of dimensions: 0 as soon as one of them is. Beyond 64 bits it is the host's
+// out-of-memory error.
+inline std::size_t elementCount(std::span<const std::size_t> lengths) {
+    if (std::ranges::find(lengths, 0U) != lengths.end()) return 0;
+    std::size_t count = 1;
+    for (const std::size_t length : lengths) {
+        if (__builtin_mul_overflow(count, length, &count)) vxMemoryRaiseExhausted();
+    }
+    return count;
+}
+
+// The number of elements of a host array that is no object.
 inline std::size_t elementCount(const vxArray* array) {
-    const std::size_t* lengths = vxArrayDimensions(array);
-    return std::accumulate(lengths, lengths + vxArrayDimensionCount(array), std::size_t{1},
-                           std::multiplies<>());
+    return elementCount({vxArrayDimensions(array), vxArrayDimensionCount(array)});
 }
 
 }  // namespace Orvandeil::FileIO::detail

@@ -2,6 +2,7 @@
 
 #include "fileio/export.h"
 #include "fileio/host/arrays.h"
+#include "fileio/memory_operation_overloads.h"
 
 #include <cstddef>
 #include <string>
@@ -10,7 +11,7 @@ namespace Orvandeil::FileIO {
 
 // Typed access to the elements of a host array, which it does not own. Class and data are asked
 // for once, so that walking an array calls the host no more.
-class FILEIO_API VxData {
+class FILEIO_API VxData : public fiMemoryOperationOverloads {
 public:
     explicit VxData(const vxArray* hostArray);
 

@@ -53,7 +53,7 @@ void foutFormatPieceForOUXbt<U, F>::printByType(TcodnStream* out, printfArgument
         const auto total = static_cast<unsigned long>(end - text.get());
         out->setBufferSize(std::max(total, static_cast<unsigned long>(width.getEffective())) + 1);
     }
-    printField(out, width.getEffective(), isLeftJustified(), text.get());
+    printField(out, isLeftJustified() ? "%-*s" : "%*s", width.getEffective(), text.get());
 }
 
 template <class U, class F>

@@ -2,7 +2,6 @@
 
 #include "fileio/constants.h"
 #include "fileio/errors/code_list.h"
-#include "fileio/printf/fout_format_pieces.h"
 #include "fileio/printf/printf_argument_source.h"
 #include "fileio/text/known_streams.h"
 #include "fileio/text/tcodn_stream.h"
@@ -62,11 +61,6 @@ foutFormatPiece::foutFormatPiece(const foutFormatPieceInitBlock& init)
 }
 
 foutFormatPiece::~foutFormatPiece() = default;
-
-std::u16string_view foutFormatPiece::getLiteralText() const {
-    const auto* literal = dynamic_cast<const foutFormatPieceForLiterals*>(this);
-    return literal == nullptr ? std::u16string_view() : literal->getText();
-}
 
 unsigned long foutFormatPiece::getBufferSize() const {
     return static_cast<unsigned long>(precision.getEffective() + width.getEffective() + 20);
@@ -138,40 +132,35 @@ void foutFormatPiece::printAsE(TcodnStream* out, printfArgumentSource* source) {
 }
 
 void foutFormatPiece::printNonFinite(TcodnStream* out, printfArgumentSource* source) {
-    const double value = source->getCurrentArgumentAs<double>();
-    const char* text = "Inf";
-    if (std::isnan(value)) {
-        text = forceSign ? "+NaN" : "NaN";
-    } else if (value < 0) {
-        text = "-Inf";
-    } else if (hasFlag(ShowSign) || width.isNegative()) {
-        // A negative width asks for the sign as well; kept on purpose.
-        text = "+Inf";
-    } else if (hasFlag(SpaceSign)) {
-        text = " Inf";
-    }
+    const char* const text = nonFiniteText(source->getCurrentArgumentAs<double>());
+    const long field = std::max(width.getEffective(), static_cast<long>(std::strlen(text)));
     if (out->needsBufferSize()) {
         out->setBufferSize(static_cast<unsigned long>(std::max(width.getEffective(), 4L)));
     }
-    printField(out, width.getEffective(), isLeftJustified(), text);
+    printField(out, "%*s", isLeftJustified() ? -field : field, text);
 }
 
-void foutFormatPiece::printField(TcodnStream* out, long fieldWidth, bool left,
+// A negative width asks for the sign as well as for the left side; kept on purpose.
+const char* foutFormatPiece::nonFiniteText(double value) const {
+    if (std::isnan(value)) return forceSign ? "+NaN" : "NaN";
+    if (value < 0) return "-Inf";
+    if (hasFlag(ShowSign) || width.isNegative()) return "+Inf";
+    return hasFlag(SpaceSign) ? " Inf" : "Inf";
+}
+
+void foutFormatPiece::printField(TcodnStream* out, const char* form, long field,
                                  const char* text) const {
-    const bool fits = fitsInt(fieldWidth);
-    const int widthPassed = fits ? static_cast<int>(fieldWidth) : 0;
-    const int result = !fits  ? printTooWide(out, fieldWidth)
-                       : left ? out->printf("%-*s", widthPassed, text)
-                              : out->printf("%*s", widthPassed, text);
-    checkPrinted(out, result);
+    if (!fitsInt(std::abs(field))) return checkPrinted(out, printTooWide(out, std::abs(field)));
+    checkPrinted(out, out->printf(form, static_cast<int>(field), text));
 }
 
 void foutFormatPiece::printWidthBuffer(TcodnStream* out, unsigned long printed) const {
+    const unsigned long wanted = static_cast<unsigned long>(width.getEffective());
+    if (printed >= wanted) return;
     char16_t pads[constants::paddingBlockUnits];
     std::fill(std::begin(pads), std::end(pads), hasFlag(ZeroPad) ? u'0' : u' ');
     // A stream that the library does not know sees every pad as a write of its own.
     const unsigned long block = detail::isKnownStream(*out) ? std::size(pads) : 1;
-    const unsigned long wanted = static_cast<unsigned long>(width.getEffective());
     for (unsigned long done = printed; done < wanted;) {
         const unsigned long count = std::min(block, wanted - done);
         if (out->PutString(pads, count) < count) throw out->getErrorCode();

@@ -73,8 +73,6 @@ public:
     WidthPrecisionFieldType getPrecisionKind() const { return precision.getKind(); }
     int getPrecisionValue() const { return precision.getValue(); }
     const std::string& getPrintfText() const { return *variants[AsParsed]; }
-    // The text of a literal; empty for a conversion.
-    std::u16string_view getLiteralText() const;
     // Where the piece stands in the format; for a literal in front of a "%", the place of the "%".
     unsigned long getFormatPosition() const { return formatPosition; }
 
@@ -88,8 +86,8 @@ protected:
     void printWidthBuffer(TcodnStream* out, unsigned long printed) const;
     // Pads `content` on the side that the justification asks for.
     void printPadded(TcodnStream* out, std::u16string_view content) const;
-    // Writes a text right-justified in `fieldWidth`, or left-justified.
-    void printField(TcodnStream* out, long fieldWidth, bool left, const char* text) const;
+    // Writes a text by a printf form that takes a width before it.
+    void printField(TcodnStream* out, const char* form, long field, const char* text) const;
 
     bool hasFlag(PrintFormatFlags flag) const { return (flags & flag) != 0; }
     bool isLeftJustified() const { return hasFlag(LeftJustify) || width.isNegative(); }
@@ -105,6 +103,7 @@ private:
     static constexpr int variantCount = 4;
 
     void chooseVariant();
+    const char* nonFiniteText(double value) const;
     void useVariant(Variant wanted, std::string (*build)(const std::string&));
     template <class T>
     int printValue(TcodnStream* out, T value) const;

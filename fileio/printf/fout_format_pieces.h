@@ -25,6 +25,9 @@ private:
     std::u16string text;
 };
 
+// The text of a literal piece; empty for a conversion.
+FILEIO_API std::u16string_view literalTextOf(const foutFormatPiece& piece);
+
 // Whole numbers of T, long or unsigned long: d i, and o u x X.
 template <class T>
 class FILEIO_API foutFormatPieceForInteger : public foutFormatPiece {

@@ -20,6 +20,11 @@ Printability foutFormatPieceForLiterals::decidePrintMode(printfArgumentSource*) 
     return Printable;
 }
 
+std::u16string_view literalTextOf(const foutFormatPiece& piece) {
+    const auto* literal = dynamic_cast<const foutFormatPieceForLiterals*>(&piece);
+    return literal == nullptr ? std::u16string_view() : literal->getText();
+}
+
 void foutFormatPieceForS::printByType(TcodnStream* out, printfArgumentSource* source) {
     std::u16string_view text;
     try {

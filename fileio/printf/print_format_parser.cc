@@ -17,33 +17,37 @@ int decimalAt(std::u16string_view text) {
     return scanUTF16Decimal(text.data(), &end);
 }
 
-PrintFormatFlags flagOf(char16_t character) {
-    switch (character) {
-        case u'-':
-            return LeftJustify;
-        case u'+':
-            return ShowSign;
-        case u' ':
-            return SpaceSign;
-        case u'#':
-            return Alternate;
-        default:
-            return ZeroPad;
-    }
+// Each flag's bit is its place in this list, each modifier's number its place in the next, from 1.
+constexpr std::u16string_view flagLetters = u"-+ #0";
+constexpr std::u16string_view modifierLetters = u"hltb";
+
+PrintFormatFlags flagOf(char16_t letter) {
+    return static_cast<PrintFormatFlags>(1 << flagLetters.find(letter));
 }
 
 PrintfSubformat modifierOf(std::u16string_view modifier) {
     if (modifier.empty()) return NoSubformat;
-    switch (modifier.front()) {
-        case u'h':
-            return SubH;
-        case u'l':
-            return SubL;
-        case u't':
-            return SubT;
-        default:
-            return SubB;
-    }
+    return static_cast<PrintfSubformat>(modifierLetters.find(modifier.front()) + 1);
+}
+
+struct Conversion {
+    char16_t letter;
+    PrintfFormat kind;
+    PrintfSubformat lastModifier;  // of those that it allows, in the order of their numbers
+
+    bool isInteger() const { return lastModifier != NoSubformat; }
+};
+
+constexpr Conversion conversions[] = {
+    {u'd', ConvD, SubL},        {u'i', ConvI, SubL},        {u'o', ConvO, SubB},
+    {u'u', ConvU, SubB},        {u'x', ConvX, SubB},        {u'X', ConvX, SubB},
+    {u'e', ConvE, NoSubformat}, {u'E', ConvE, NoSubformat}, {u'f', ConvF, NoSubformat},
+    {u'g', ConvG, NoSubformat}, {u'G', ConvG, NoSubformat}, {u's', ConvS, NoSubformat},
+    {u'c', ConvC, NoSubformat},
+};
+
+const Conversion& conversionOf(char16_t letter) {
+    return *std::ranges::find(conversions, letter, &Conversion::letter);
 }
 
 }  // namespace
@@ -198,56 +202,14 @@ void PrintFormatParser::extractSubFormatPart() {
 }
 
 void PrintFormatParser::extractFormatPart() {
-    switch (match.conversion.front()) {
-        case u'd':
-            extractIntegerFormat(ConvD, false);
-            break;
-        case u'i':
-            extractIntegerFormat(ConvI, false);
-            break;
-        case u'o':
-            extractIntegerFormat(ConvO, true);
-            break;
-        case u'u':
-            extractIntegerFormat(ConvU, true);
-            break;
-        case u'x':
-        case u'X':
-            extractIntegerFormat(ConvX, true);
-            break;
-        case u'e':
-        case u'E':
-            extractPlainFormat(ConvE);
-            break;
-        case u'f':
-            extractPlainFormat(ConvF);
-            break;
-        case u'g':
-        case u'G':
-            extractPlainFormat(ConvG);
-            break;
-        case u's':
-            extractPlainFormat(ConvS);
-            hasStringConversion = true;
-            break;
-        default:
-            extractPlainFormat(ConvC);
-            if (precisionKind != FieldAbsent) recordInvalidFormat();
-            break;
-    }
+    const Conversion& found = conversionOf(match.conversion.front());
+    conversion = found.kind;
+    hasStringConversion = hasStringConversion || conversion == ConvS;
+    if (subformat > found.lastModifier) recordInvalidFormat();
+    if (conversion == ConvC && precisionKind != FieldAbsent) recordInvalidFormat();
+    // Whole numbers are always 64 bits wide, whatever modifier was written.
+    if (found.isInteger()) subformatText += u"ll";
     subformatText += match.conversion;
-}
-
-void PrintFormatParser::extractIntegerFormat(PrintfFormat kind, bool bitPatternAllowed) {
-    conversion = kind;
-    if (!bitPatternAllowed && (subformat == SubT || subformat == SubB)) recordInvalidFormat();
-    // Values are always 64 bits wide, whatever modifier was written.
-    subformatText += u"ll";
-}
-
-void PrintFormatParser::extractPlainFormat(PrintfFormat kind) {
-    conversion = kind;
-    if (subformat != NoSubformat) recordInvalidFormat();
 }
 
 // Numbered and sequential references do not mix within one format.

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "fileio/export.h"
+#include "fileio/memory_operation_overloads.h"
 #include "fileio/printf/conversion_token.h"
 #include "fileio/printf/fout_format_piece.h"
 #include "fileio/printf/vocabulary.h"
@@ -14,7 +15,7 @@ namespace Orvandeil::FileIO {
 // Splits an output format, escapes already converted, into pieces: literal runs and conversions.
 // It knows neither arguments nor output. A malformed conversion ends the parse but is reported only
 // when the pieces before it are used up, so that everything in front of it is still printed.
-class FILEIO_API PrintFormatParser {
+class FILEIO_API PrintFormatParser : public fiMemoryOperationOverloads {
 public:
     enum PrintFormatArgumentType : int {
         ArgumentsNone = 0,  // no conversion has referred to an argument
@@ -62,8 +63,6 @@ private:
     void extractPrecisionPart();
     void extractSubFormatPart();
     void extractFormatPart();
-    void extractIntegerFormat(PrintfFormat kind, bool bitPatternAllowed);
-    void extractPlainFormat(PrintfFormat kind);
     // What the "*" of a width or precision refers to, `digits` being the text behind it.
     WidthPrecisionFieldType extractReference(std::u16string_view digits, int& number);
     void setArgumentType(PrintFormatArgumentType type);

@@ -5,28 +5,18 @@
 #include "fileio/errors/code_list.h"
 #include "fileio/errors/identifiers.h"
 #include "fileio/host/dispatch.h"
-#include "fileio/host/memory.h"
 #include "fileio/host/messages.h"
 #include "fileio/printf/element_range.h"
 
 namespace Orvandeil::FileIO {
 namespace {
 
-std::size_t product(const std::vector<std::size_t>& lengths, std::size_t from) {
-    std::size_t result = 1;
-    for (std::size_t i = from; i < lengths.size(); ++i) {
-        if (__builtin_mul_overflow(result, lengths[i], &result)) vxMemoryRaiseExhausted();
-    }
-    return result;
-}
-
 std::vector<std::size_t> objectDimensions(const vxArray* object) {
     const detail::OwnedArray size(vxDispatchCall("size", &object, 1));
     const bool usable = size && vxArrayClassID(size.get()) == vxDOUBLE_CLASS &&
-                        vxArrayIsVector(size.get()) && !vxArrayIsScalar(size.get());
+                        vxArrayIsVector(size.get()) && detail::elementCount(size.get()) >= 2;
     if (!usable) vxErrMsgId(KESTRA::printf::invalidSizeResult(vxArrayClassName(object)));
-    const std::size_t* shape = vxArrayDimensions(size.get());
-    std::vector<std::size_t> dimensions(shape[0] * shape[1]);
+    std::vector<std::size_t> dimensions(detail::elementCount(size.get()));
     AssignToVoidBuffer(vxUINT64_CLASS, dimensions.data(), VxData(size.get()), dimensions.size());
     return dimensions;
 }
@@ -49,7 +39,7 @@ void printfArgumentSource::setupArg() {
     elementIndex = 0;
     if (argIndex >= argc) return;
     dims = dimensionsOf(args[argIndex]);
-    argLength = product(dims, 0);
+    argLength = detail::elementCount(dims);
     data = std::make_unique<VxData>(args[argIndex]);
 }
 
@@ -90,7 +80,7 @@ std::size_t printfArgumentSource::remainingArgumentLength() const {
 void printfArgumentSource::consumeArgument() {}
 
 bool printfArgumentSource::canUsePercentSOptimization() {
-    return data->getClassID() == vxCHAR_CLASS || data->isObject();
+    return data && (data->getClassID() == vxCHAR_CLASS || data->isObject());
 }
 
 bool printfArgumentSource::prepareCurrentArgument(bool allowEmpty) {
@@ -142,7 +132,7 @@ bool printfArgumentSource::isCharacterCode() const {
 
 namespace {
 
-// The integer type whose values a conversion to T can show; any finite number for double.
+// Whether a conversion to T can show a finite element in its own form.
 template <class T>
 bool isShowable(const VxData& data, std::size_t index) {
     return detail::isRepresentable<T>(data, index);
@@ -222,7 +212,7 @@ std::size_t printfMatrixArgumentSource::remainingArgumentLength() const {
 }
 
 bool printfMatrixArgumentSource::canUsePercentSOptimization() {
-    return data->isObject();
+    return data && data->isObject();
 }
 
 void printfMatrixArgumentSource::setRow(std::size_t r) {
@@ -237,7 +227,7 @@ void printfMatrixArgumentSource::resetRow() {
 }
 
 std::size_t printfMatrixArgumentSource::columnCount() const {
-    return product(dims, 1);
+    return detail::elementCount(std::span(dims).subspan(1));
 }
 
 }  // namespace Orvandeil::FileIO

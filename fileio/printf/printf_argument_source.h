@@ -122,7 +122,7 @@ public:
     std::size_t remainingArgumentLength() const override;
     bool canUsePercentSOptimization() override;
 
-    // Goes to the first element of row `r`, counted from 0.
+    // Goes to the first element of row `r`, counted from 0 and below the number of rows.
     void setRow(std::size_t r);
     // Goes back to the first column, after a row was walked to its end.
     void resetRow();

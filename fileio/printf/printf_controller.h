@@ -1,6 +1,7 @@
 #pragma once
 
 #include "fileio/export.h"
+#include "fileio/memory_operation_overloads.h"
 #include "fileio/printf/print_format_parser.h"
 #include "fileio/printf/printf_argument_source.h"
 
@@ -11,7 +12,7 @@ namespace Orvandeil::FileIO {
 
 // One call of formatted output: prints the pieces of a format to a stream, again and again while
 // argument data remains. Stream and arrays are not owned and outlive the controller.
-class FILEIO_API printfController {
+class FILEIO_API printfController : public fiMemoryOperationOverloads {
 public:
     // Never fails for a bad format; doPrintf tells. Raises what the "size" of an object raises.
     printfController(std::u16string format, TcodnStream* out, const vxArray** args, int count);

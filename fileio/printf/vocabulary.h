@@ -43,8 +43,8 @@ constexpr PrintFormatFlags operator|(PrintFormatFlags a, PrintFormatFlags b) {
 
 // Where a width or precision comes from.
 enum WidthPrecisionFieldType : int {
-    FieldLiteral = 0,           // written in the format
-    FieldAbsent = 1,            //
+    FieldLiteral = 0,  // written in the format
+    FieldAbsent = 1,
     FieldNumberedArgument = 2,  // *n$
     FieldNextArgument = 3       // *
 };

@@ -1,12 +1,11 @@
 #include "fileio/text/output_screen_stream.h"
 
-#include "fileio/buffers/host_block.h"
-#include "fileio/constants.h"
 #include "fileio/host/memory.h"
-#include "fileio/text/bounded_format.h"
+#include "fileio/text/piecewise_format.h"
 
 #include <algorithm>
 #include <cstring>
+#include <string>
 
 namespace Orvandeil::FileIO {
 
@@ -30,16 +29,15 @@ int outputScreenStream::print(const char* format, std::va_list arguments) {
 }
 
 int outputScreenStream::printCommon(const char* format, std::va_list arguments) {
-    char scratch[constants::numberScratchBytes];
-    detail::HostBytes block;
-    const char* text = scratch;
-    const auto grow = [&block](std::size_t bytes) {
-        block.reset(static_cast<char*>(vxMemoryAllocateOrRaise(bytes)));
-        return block.get();
+    bool refused = false;
+    const auto put = [&refused](const char* text, std::size_t count) {
+        refused = vxConsolePutString(std::string(text, count).c_str()) == -1;
+        return !refused;
     };
-    const int length = detail::formatBounded(scratch, grow, text, format, arguments);
+    std::string block;
+    const int length = detail::formatPiecewise(put, block, format, arguments);
     if (length < 0) return length;
-    if (vxConsolePutString(text) == -1) return 0;
+    if (refused) return 0;
     const auto count = static_cast<std::size_t>(length);
     countWritten(count, count);
     return length;

@@ -2,7 +2,7 @@
 
 #include "fileio/constants.h"
 #include "fileio/host/memory.h"
-#include "fileio/text/bounded_format.h"
+#include "fileio/text/piecewise_format.h"
 
 #include <algorithm>
 #include <cstring>
@@ -36,14 +36,15 @@ unsigned long outputStringStream::PutNElements(unsigned long count, const void* 
 }
 
 int outputStringStream::print(const char* format, std::va_list arguments) {
-    char scratch[constants::numberScratchBytes];
-    const char* text = scratch;
-    const auto grow = [this](std::size_t bytes) {
-        printScratch.resize(bytes);
-        return printScratch.data();
+    int written = 0;
+    const auto put = [this, &written](const char* text, std::size_t count) {
+        const int taken = PutASCIIString(text, static_cast<int>(count));
+        written += taken;
+        // More than asked is a byte-order mark in front.
+        return static_cast<std::size_t>(taken) >= count;
     };
-    const int length = detail::formatBounded(scratch, grow, text, format, arguments);
-    return length < 0 ? length : PutASCIIString(text, length);
+    const int length = detail::formatPiecewise(put, printScratch, format, arguments);
+    return length < 0 ? length : written;
 }
 
 bool outputStringStream::EndOfData() {

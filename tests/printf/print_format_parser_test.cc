@@ -1,6 +1,7 @@
 #include "fileio/printf/print_format_parser.h"
 
 #include "fileio/errors/code_list.h"
+#include "fileio/printf/fout_format_pieces.h"
 #include "fileio/text/output_string_stream.h"
 #include "tests/support/printing.h"
 
@@ -24,7 +25,7 @@ std::string describeField(char name, WidthPrecisionFieldType kind, int value) {
 std::string describe(const foutFormatPiece& piece) {
     const std::string place = '@' + std::to_string(piece.getFormatPosition());
     if (piece.getConversion() == NoConversion) {
-        return '\'' + toUtf8(piece.getLiteralText()) + '\'' + place;
+        return '\'' + toUtf8(literalTextOf(piece)) + '\'' + place;
     }
     std::string text = piece.getPrintfText() + ' ' + std::to_string(piece.getConversion());
     if (piece.getSubformat() != NoSubformat) text += '/' + std::to_string(piece.getSubformat());
@@ -105,9 +106,9 @@ TEST(PrintFormatParser, SplitsFormatsIntoPieces) {
 TEST(PrintFormatParser, KeepsNulInsideTheFormat) {
     using namespace std::string_view_literals;
     PrintFormatParser parser(std::u16string(u"a\0b%d\0"sv), false);
-    EXPECT_EQ(parser.getNextPrintFormatPiece()->getLiteralText(), u"a\0b"sv);
+    EXPECT_EQ(literalTextOf(*parser.getNextPrintFormatPiece()), u"a\0b"sv);
     EXPECT_EQ(parser.getNextPrintFormatPiece()->getConversion(), ConvD);
-    EXPECT_EQ(parser.getNextPrintFormatPiece()->getLiteralText(), u"\0"sv);
+    EXPECT_EQ(literalTextOf(*parser.getNextPrintFormatPiece()), u"\0"sv);
     EXPECT_EQ(parser.getNextPrintFormatPiece(), nullptr);
 }
 
