@@ -8,6 +8,10 @@ namespace {
 
 constexpr int firstNumber = FileTable::errorConsole + 1;
 
+CodeError notOpen(int number) {
+    return {EBADF, "file " + std::to_string(number)};
+}
+
 std::unique_ptr<OpenFile> openStandard(int number) {
     switch (number) {
         case FileTable::standardInput:
@@ -17,7 +21,7 @@ std::unique_ptr<OpenFile> openStandard(int number) {
         case FileTable::errorConsole:
             return openErrorConsole();
         default:
-            throw CodeError(EBADF, "file " + std::to_string(number));
+            throw notOpen(number);
     }
 }
 
@@ -48,8 +52,9 @@ OpenFile& FileTable::file(int number) {
 }
 
 std::optional<Failure> FileTable::close(int number) {
-    file(number);
-    return closeFile(std::move(files.extract(number).mapped()));
+    auto taken = files.extract(number);
+    if (taken.empty()) throw notOpen(number);
+    return closeFile(std::move(taken.mapped()));
 }
 
 std::vector<int> FileTable::numbers() const {

@@ -28,7 +28,8 @@ public:
     int open(const std::string& name, const OpenRequest& request);
     // CodeError with EBADF for a number that is not open.
     OpenFile& file(int number);
-    // Settles and closes; the number is free in any case.
+    // Settles and closes; the number is free in any case. CodeError with EBADF, also for a standard
+    // number that nobody has asked for yet.
     std::optional<Failure> close(int number);
     // Those opened by open(), in ascending order.
     std::vector<int> numbers() const;

@@ -48,6 +48,7 @@ TEST(FileTable, KeepsFilesAtTheirAddresses) {
     EXPECT_EQ(table.file(one).label, first.path());
     EXPECT_EQ(table.close(one), std::nullopt);
     EXPECT_EQ(codeOf([&] { table.file(one); }), EBADF);
+    EXPECT_EQ(codeOf([&] { table.close(FileTable::standardInput); }), EBADF);
     EXPECT_EQ(table.open(second.path(), {"r+", "b", ""}), one);
     EXPECT_EQ(table.file(one).format.dataSizeType, 1);
     EXPECT_EQ(table.numbers().size(), 20u);
