@@ -12,8 +12,8 @@
 #include <cmath>
 #include <cstdlib>
 #include <fcntl.h>
+#include <poll.h>
 #include <string>
-#include <thread>
 #include <unistd.h>
 #include <vector>
 
@@ -190,14 +190,16 @@ TEST(Spool, HoldsAllOfAPipe) {
     EXPECT_EQ(ftello(copy.get()), 3000003);
 }
 
-// What a terminal shows of a transfer that lasts as long as this.
-std::string shownOn(int terminal, int reader, std::chrono::milliseconds delay) {
+// What the other end of a terminal sees of a transfer that goes on until there is something, or for
+// `patience`.
+std::string shownOn(int terminal, int reader, ProgressLine::Delay delay, int patience) {
     const TempFile content(std::string(3 << 20, 'x'));
     std::FILE* const file = std::fopen(content.path().c_str(), "r");
     fseeko(file, 1 << 20, SEEK_SET);
     {
         const ProgressLine progress(fileno(file), "reading x", terminal, delay);
-        std::this_thread::sleep_for(std::chrono::milliseconds(60));
+        pollfd something = {reader, POLLIN, 0};
+        poll(&something, 1, patience);
     }
     std::fclose(file);
     fcntl(reader, F_SETFL, O_NONBLOCK);
@@ -207,20 +209,23 @@ std::string shownOn(int terminal, int reader, std::chrono::milliseconds delay) {
 }
 
 TEST(ProgressLine, IsForTerminalsAndLongTransfers) {
+    constexpr ProgressLine::Delay soon{1};
+    constexpr ProgressLine::Delay late = std::chrono::hours(1);
     const int master = posix_openpt(O_RDWR | O_NOCTTY);
     if (master < 0) GTEST_SKIP() << "no pseudo-terminals";
     grantpt(master);
     unlockpt(master);
     const int terminal = ::open(ptsname(master), O_RDWR | O_NOCTTY);
     ASSERT_GE(terminal, 0);
-    EXPECT_EQ(shownOn(terminal, master, std::chrono::milliseconds(1)),
-              "\r\x1B[Kreading x: 1.0 MiB of 3.0 MiB\r\x1B[K");
-    EXPECT_EQ(shownOn(terminal, master, std::chrono::milliseconds(2000)), "");
+    const std::string shown = shownOn(terminal, master, soon, 10000);
+    EXPECT_TRUE(shown.starts_with("\r\x1B[Kreading x: 1.0 MiB of 3.0 MiB\r\x1B[K")) << shown;
+    EXPECT_TRUE(shown.ends_with("\r\x1B[K")) << shown;
+    EXPECT_EQ(shownOn(terminal, master, late, 50), "");
     ::close(terminal);
     ::close(master);
     int ends[2];
     ASSERT_EQ(pipe(ends), 0);
-    EXPECT_EQ(shownOn(ends[1], ends[0], std::chrono::milliseconds(1)), "");
+    EXPECT_EQ(shownOn(ends[1], ends[0], soon, 50), "");
     ::close(ends[0]);
     ::close(ends[1]);
 }
