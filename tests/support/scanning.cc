@@ -1,14 +1,12 @@
 #include "tests/support/scanning.h"
 
-#include "fileio/attributes/file_permission.h"
 #include "fileio/scanf/scan_control.h"
-#include "fileio/streams/file_stream.h"
 #include "fileio/text/input_string_stream.h"
-#include "tests/support/memory_file.h"
 #include "tests/support/printing.h"
+#include "tests/support/test_files.h"
 
+#include <cerrno>
 #include <charconv>
-#include <vector>
 
 namespace support {
 namespace {
@@ -47,13 +45,12 @@ std::string valuesOf(OutputBuffer& buffer) {
     }
 }
 
-Scanned scanMemoryFile(std::string_view input, MemoryFile::Kind kind, std::string_view format,
-                       long limit, const std::string& encoding) {
-    constexpr std::size_t readAhead = 5;
-    const MemoryFile file(std::string(input), kind, readAhead);
-    FilePermission permission;
-    fileStream stream(file.get(), encoding, permission, u"");
-    return scan(stream, format, limit);
+Scanned scanBytes(FaultyFile file, std::string_view format, long limit,
+                  const std::string& encoding) {
+    char readAhead[5];
+    OpenedFile opened(file.open("r"), "r", encoding);
+    std::setvbuf(opened.file, readAhead, _IOFBF, sizeof readAhead);
+    return scan(opened.stream, format, limit);
 }
 
 }  // namespace
@@ -82,12 +79,13 @@ Scanned scan(TcodnStream& stream, std::string_view format, long limit) {
 
 Scanned scanFile(std::string_view input, std::string_view format, long limit,
                  const std::string& encoding) {
-    return scanMemoryFile(input, MemoryFile::Seekable, format, limit, encoding);
+    return scanBytes({.bytes = std::string(input)}, format, limit, encoding);
 }
 
 Scanned scanPipe(std::string_view input, std::string_view format, long limit,
                  const std::string& encoding) {
-    return scanMemoryFile(input, MemoryFile::PipeLike, format, limit, encoding);
+    return scanBytes({.bytes = std::string(input), .failingSeek = 1, .error = ESPIPE}, format,
+                     limit, encoding);
 }
 
 Scanned scanText(std::string_view input, std::string_view format, long limit,
