@@ -5,11 +5,22 @@
 #include "fileio/host/dispatch.h"
 #include "fileio/host/text.h"
 
+#include <new>
 #include <span>
 
 namespace cli {
 
 namespace embedded = Orvandeil::FileIO::embedded;
+
+void* JsonMemory::Realloc(void* block, std::size_t, std::size_t bytes) {
+    if (bytes == 0) {
+        std::free(block);
+        return nullptr;
+    }
+    void* const resized = std::realloc(block, bytes);
+    if (resized == nullptr) throw std::bad_alloc();
+    return resized;
+}
 
 JsonWriter& JsonWriter::key(std::string_view name) {
     writer.Key(name.data(), static_cast<rapidjson::SizeType>(name.size()));
@@ -66,6 +77,12 @@ void JsonWriter::stringData(const vxArray& array) {
             value(vxStringArrayText(&array, i));
         }
     }
+}
+
+void JsonWriter::restart() {
+    buffer.Clear();
+    writer.Reset(buffer);
+    writer.StartObject();
 }
 
 std::string_view JsonWriter::finish() {

@@ -4,6 +4,8 @@
 #include "fileio/host/arrays.h"
 
 #include <concepts>
+#include <cstddef>
+#include <cstdlib>
 #include <string>
 #include <string_view>
 
@@ -11,6 +13,14 @@
 #include <rapidjson/writer.h>
 
 namespace cli {
+
+// Memory for the writer, whose own allocators do not look whether they got any.
+struct JsonMemory {
+    static constexpr bool kNeedFree = true;
+    void* Malloc(std::size_t bytes) { return Realloc(nullptr, 0, bytes); }
+    void* Realloc(void* block, std::size_t, std::size_t bytes);
+    static void Free(void* block) { std::free(block); }
+};
 
 // One JSON object, written key by key into memory. It is open from the beginning.
 class JsonWriter {
@@ -44,6 +54,9 @@ public:
     // of a string array are texts, missing ones null.
     void arrayKeys(const vxArray& array);
 
+    // Starts the object anew, without a key.
+    void restart();
+
     // Closes the object and gives its text, one line with its end.
     std::string_view finish();
 
@@ -52,8 +65,10 @@ private:
     void data(const vxArray& array);
     void stringData(const vxArray& array);
 
-    rapidjson::StringBuffer buffer;
-    rapidjson::Writer<rapidjson::StringBuffer> writer{buffer};
+    using Encoding = rapidjson::UTF8<>;
+    using Buffer = rapidjson::GenericStringBuffer<Encoding, JsonMemory>;
+    Buffer buffer;
+    rapidjson::Writer<Buffer, Encoding, Encoding, JsonMemory> writer{buffer};
 };
 
 }  // namespace cli

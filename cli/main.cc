@@ -50,9 +50,9 @@ void runReporting(const Verb& verb, const CommandLine& line, Report& report) {
     } catch (const IMsgIDException& error) {
         report.fail(error);
     } catch (const std::bad_alloc&) {
-        report.fail(code::NoMemory);
+        report.failExhausted();
     } catch (const std::length_error&) {
-        report.fail(code::NoMemory);
+        report.failExhausted();
     } catch (const Orvandeil::FileIO::ConversionSizeError& error) {
         report.fail(code::SizeTooBig, error.what());
     } catch (const std::exception& error) {

@@ -122,6 +122,7 @@ private:
 
 std::unique_ptr<OpenFile> openFile(const CommandLine& line) {
     const std::string path(*line.value("output"));
+    if (path == "-") return embedded::openStandardOutput(std::string(line.valueOr("encoding", "")));
     return embedded::openFile(path, outputRequest(path, line));
 }
 

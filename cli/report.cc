@@ -52,6 +52,11 @@ void Report::fail(const IMsgIDException& error, std::string_view place) {
     tell(error.what(), place);
 }
 
+void Report::failExhausted() {
+    json.restart();
+    fail(Orvandeil::FileIO::code::NoMemory);
+}
+
 void Report::note(int status) {
     code = status;
     identifier = describeCode(status).identifier;

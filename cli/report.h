@@ -37,6 +37,8 @@ public:
     void fail(int code, std::string_view place = {});
     // The call failed with an identifier that has no code.
     void fail(const foundation::core::except::IMsgIDException& error, std::string_view place = {});
+    // The call ended for want of memory, perhaps within a key: the verb's keys are given up.
+    void failExhausted();
     // A code that ended the call without being an error.
     void note(int code);
     // The identifier that is the answer itself.

@@ -1,6 +1,7 @@
 #include "cli/suggestion.h"
 
 #include <algorithm>
+#include <cctype>
 #include <vector>
 
 namespace cli {
@@ -9,6 +10,14 @@ namespace {
 // A third of the letters may be wrong, and one in short names.
 bool isNear(std::size_t distance, std::string_view name) {
     return distance <= std::max<std::size_t>(1, name.size() / 3);
+}
+
+std::string lowerCase(std::string_view name) {
+    std::string lower(name);
+    std::ranges::transform(lower, lower.begin(), [](unsigned char letter) {
+        return static_cast<char>(std::tolower(letter));
+    });
+    return lower;
 }
 
 std::string listed(std::span<const std::string_view> names) {
@@ -46,7 +55,9 @@ std::size_t editDistance(std::string_view from, std::string_view to) {
 std::string unknownName(std::string_view kind, std::string_view given,
                         std::span<const std::string_view> names) {
     std::string message = "unknown " + std::string(kind) + " \"" + std::string(given) + '"';
-    const auto distance = [given](std::string_view name) { return editDistance(given, name); };
+    const auto distance = [given](std::string_view name) {
+        return editDistance(lowerCase(given), lowerCase(name));
+    };
     const auto nearest = std::ranges::min_element(names, {}, distance);
     if (nearest != names.end() && isNear(distance(*nearest), *nearest)) {
         return message + "; did you mean \"" + std::string(*nearest) + "\"?";

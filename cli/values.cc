@@ -130,6 +130,12 @@ bool isQuoted(std::string_view argument) {
     return argument.size() >= 2 && argument.starts_with('\'') && argument.ends_with('\'');
 }
 
+// Whether numbers are meant, well-formed or not; "double: yes" is a text like any other.
+bool looksLikeNumbers(std::string_view text) {
+    return text.starts_with("Inf") || text.starts_with("NaN") ||
+           text.find_first_of("[+-.0123456789") == 0;
+}
+
 ArrayPtr readBare(std::string_view argument) {
     const Literal literal = readLiteral(argument, realLength);
     if (literal.state == Literal::UnequalRows) refuseRows(argument, 0, literal);
@@ -160,7 +166,9 @@ ArrayPtr readValue(std::string_view argument) {
     const std::size_t prefix = argument.find(':') + 1;  // 0 when there is none
     if (prefix > 0) {
         const std::string_view name = argument.substr(0, prefix - 1);
-        if (name == "string") return readString(argument.substr(prefix));
+        const std::string_view rest = argument.substr(prefix);
+        if (name == "string") return readString(rest);
+        if (!looksLikeNumbers(rest)) return embedded::makeChars(wide(argument));
         if (name == "complex") {
             return complexArray(readPrefixed(argument, prefix, complexLength));
         }

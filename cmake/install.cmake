@@ -7,7 +7,9 @@ install(DIRECTORY ${PROJECT_SOURCE_DIR}/fileio DESTINATION ${CMAKE_INSTALL_INCLU
     FILES_MATCHING PATTERN *.h)
 if(FILEIO_HOST STREQUAL "embedded")
   install(TARGETS fileio_embedded EXPORT fileioTargets)
-  install(TARGETS fileio_program)
+  if(FILEIO_BUILD_PROGRAM)
+    install(TARGETS fileio_program)
+  endif()
   install(DIRECTORY ${PROJECT_SOURCE_DIR}/embedded/services
       DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/embedded FILES_MATCHING PATTERN *.h)
 endif()

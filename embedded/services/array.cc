@@ -68,11 +68,10 @@ ArrayPtr makeNumeric(vxClassID classID, Dimensions dimensions, vxComplexity comp
     auto array = makeBare(classID, nameOfClass(classID), atLeastTwo(std::move(dimensions)));
     const std::size_t count = checkedCount(array->dimensions);
     const std::size_t size = elementBytes(classID);
-    if (count > 0 && size > 0) {
-        array->real.reset(vxMemoryAllocateZeroedOrRaise(count, size));
-        if (complexity == vxCOMPLEX) {
-            array->imaginary.reset(vxMemoryAllocateZeroedOrRaise(count, size));
-        }
+    if (count > 0 && size > 0) array->real.reset(vxMemoryAllocateZeroedOrRaise(count, size));
+    // An empty array may be complex, too.
+    if (size > 0 && complexity == vxCOMPLEX) {
+        array->imaginary.reset(vxMemoryAllocateZeroedOrRaise(count, size));
     }
     return ArrayPtr(array.release());
 }

@@ -3,9 +3,9 @@
 #include "fileio/host/data_sizes.h"
 
 #include <algorithm>
-#include <charconv>
-#include <cmath>
+#include <cstdlib>
 #include <iterator>
+#include <string>
 #include <string_view>
 
 bool qzu_isbreakablespace(char16_t unit) {
@@ -50,11 +50,12 @@ std::string vxTextDetectCharset(const char* bytes, std::size_t count, vxConsoleS
 }
 
 double vxTextToDouble(const char* text, std::size_t count, std::size_t* consumed) {
-    double value = 0;
-    const auto read = std::from_chars(text, text + count, value);
-    *consumed =
-        read.ec == std::errc::invalid_argument ? 0 : static_cast<std::size_t>(read.ptr - text);
-    return read.ec == std::errc() ? value : std::nan("");
+    // The library keeps the numeric locale at "C".
+    const std::string number(text, count);
+    char* end;
+    const double value = std::strtod(number.c_str(), &end);
+    *consumed = static_cast<std::size_t>(end - number.c_str());
+    return value;
 }
 
 namespace {

@@ -80,19 +80,21 @@ int SizeAttribute::ParseSize(const vxArray* array, int* form) {
 
 int SizeAttribute::parseScalar(double value) {
     if (!isCount(value)) return 1;
-    isInfinite = isInfinite || value > limit;
-    m = value > limit ? 1 : static_cast<unsigned long>(value);
-    n = value == 0 || value > limit ? 0 : 1;
-    return 0;
+    if (value > limit) return accept(1, 0, true);
+    return accept(value, value == 0 ? 0 : 1, false);
 }
 
 int SizeAttribute::parsePair(double rows, double columns) {
     if (!isCount(rows) || !isCount(columns) || rows > limit) return 1;
-    const bool endless = columns > limit;
-    if (!endless && rows * columns > limit) return 1;
+    if (columns > limit) return accept(rows, 0, rows != 0);
+    if (rows * columns > limit) return 1;
+    return accept(rows, columns, false);
+}
+
+int SizeAttribute::accept(double rows, double columns, bool endless) {
     m = static_cast<unsigned long>(rows);
-    n = endless ? 0 : static_cast<unsigned long>(columns);
-    isInfinite = isInfinite || (endless && rows != 0);
+    n = static_cast<unsigned long>(columns);
+    isInfinite = endless;
     return 0;
 }
 

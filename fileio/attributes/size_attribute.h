@@ -38,6 +38,7 @@ public:
 private:
     int parseScalar(double value);
     int parsePair(double rows, double columns);
+    int accept(double rows, double columns, bool endless);
 };
 
 }  // namespace Orvandeil::FileIO

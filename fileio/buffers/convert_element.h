@@ -18,13 +18,21 @@ namespace Orvandeil::FileIO::detail {
 enum class Logical : std::uint8_t {};
 
 // The classes with plain elements and the types of those.
-#define FILEIO_FOR_EACH_ELEMENT(apply)                                                          \
-    apply(vxLOGICAL_CLASS, Logical) apply(vxCHAR_CLASS, char16_t) apply(vxDOUBLE_CLASS, double) \
-        apply(vxSINGLE_CLASS, float) apply(vxINT8_CLASS, std::int8_t)                           \
-            apply(vxUINT8_CLASS, std::uint8_t) apply(vxINT16_CLASS, std::int16_t)               \
-                apply(vxUINT16_CLASS, std::uint16_t) apply(vxINT32_CLASS, std::int32_t)         \
-                    apply(vxUINT32_CLASS, std::uint32_t) apply(vxINT64_CLASS, std::int64_t)     \
-                        apply(vxUINT64_CLASS, std::uint64_t)
+// clang-format off
+#define FILEIO_FOR_EACH_ELEMENT(apply)   \
+    apply(vxLOGICAL_CLASS, Logical)      \
+    apply(vxCHAR_CLASS, char16_t)        \
+    apply(vxDOUBLE_CLASS, double)        \
+    apply(vxSINGLE_CLASS, float)         \
+    apply(vxINT8_CLASS, std::int8_t)     \
+    apply(vxUINT8_CLASS, std::uint8_t)   \
+    apply(vxINT16_CLASS, std::int16_t)   \
+    apply(vxUINT16_CLASS, std::uint16_t) \
+    apply(vxINT32_CLASS, std::int32_t)   \
+    apply(vxUINT32_CLASS, std::uint32_t) \
+    apply(vxINT64_CLASS, std::int64_t)   \
+    apply(vxUINT64_CLASS, std::uint64_t)
+// clang-format on
 
 inline constexpr int firstElementClass = vxLOGICAL_CLASS;
 inline constexpr int lastElementClass = vxUINT64_CLASS;

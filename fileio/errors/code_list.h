@@ -5,28 +5,54 @@
 // made from this list, and the catalog is checked against it.
 //
 // FILEIO_FOR_EACH_CODE(apply) expands apply(number, Name) for every line.
-#define FILEIO_FOR_EACH_CODE(apply)                                                                \
-    apply(-1, NoHelp) apply(-2, CannotOpenFile) apply(-3, IsOpenRead) apply(-4, EndOfFile)         \
-        apply(-5, IsOpenWrite) apply(-6, NoSpace) apply(-7, FlushError) apply(-8, InvalidFormat)   \
-            apply(-9, MatchingFailure) apply(-10, SizeTooBig) apply(-11, NoMemory) apply(          \
-                -12, NoMemoryForString) apply(-13, NotEnoughArgs) apply(-14, UnsupportedDirective) \
-                apply(-15, BadWidthNaN) apply(-16, BadWidthNegInf) apply(-17, BadWidthInf) apply(  \
-                    -18, BadWidthInt) apply(-19, BadWidthEmptyArg) apply(-20, BadPrecisionNaN)     \
-                    apply(-21, BadPrecisionNegInf) apply(-22, BadPrecisionInf) apply(              \
-                        -23, BadPrecisionInt) apply(-24, BadPrecisionEmptyArg)                     \
-                        apply(-25, BadOffsetNaN) apply(-26, BadOffsetBeforeBegin) apply(           \
-                            -27, BadOffsetAfterEnd) apply(-28, BadOffsetInt) apply(-29, EmptyArg)  \
-                            apply(-30, UngetcFailed) apply(-31, WriteCarryByteFailed)              \
-                                apply(-32, RequireBinaryFile) apply(-33, FseekFailed)              \
-                                    apply(-34, ReadFailed) apply(-35, FseekFailedNegOne)           \
-                                        apply(-36, FseekFailedSkip) apply(-37, InvalidChar)        \
-                                            apply(-38, TruncatedChar) apply(-39, IllegalChar)      \
-                                                apply(-40, InvalidTableFormat)                     \
-                                                    apply(-41, BufferOverflow)                     \
-                                                        apply(-42, UnknownError)                   \
-                                                            apply(-43, NonScalarNumbered)          \
-                                                                apply(-44, NumberedMoreThanArgc)   \
-                                                                    apply(-45, InternalError)
+// clang-format off
+#define FILEIO_FOR_EACH_CODE(apply)  \
+    apply(-1, NoHelp)                \
+    apply(-2, CannotOpenFile)        \
+    apply(-3, IsOpenRead)            \
+    apply(-4, EndOfFile)             \
+    apply(-5, IsOpenWrite)           \
+    apply(-6, NoSpace)               \
+    apply(-7, FlushError)            \
+    apply(-8, InvalidFormat)         \
+    apply(-9, MatchingFailure)       \
+    apply(-10, SizeTooBig)           \
+    apply(-11, NoMemory)             \
+    apply(-12, NoMemoryForString)    \
+    apply(-13, NotEnoughArgs)        \
+    apply(-14, UnsupportedDirective) \
+    apply(-15, BadWidthNaN)          \
+    apply(-16, BadWidthNegInf)       \
+    apply(-17, BadWidthInf)          \
+    apply(-18, BadWidthInt)          \
+    apply(-19, BadWidthEmptyArg)     \
+    apply(-20, BadPrecisionNaN)      \
+    apply(-21, BadPrecisionNegInf)   \
+    apply(-22, BadPrecisionInf)      \
+    apply(-23, BadPrecisionInt)      \
+    apply(-24, BadPrecisionEmptyArg) \
+    apply(-25, BadOffsetNaN)         \
+    apply(-26, BadOffsetBeforeBegin) \
+    apply(-27, BadOffsetAfterEnd)    \
+    apply(-28, BadOffsetInt)         \
+    apply(-29, EmptyArg)             \
+    apply(-30, UngetcFailed)         \
+    apply(-31, WriteCarryByteFailed) \
+    apply(-32, RequireBinaryFile)    \
+    apply(-33, FseekFailed)          \
+    apply(-34, ReadFailed)           \
+    apply(-35, FseekFailedNegOne)    \
+    apply(-36, FseekFailedSkip)      \
+    apply(-37, InvalidChar)          \
+    apply(-38, TruncatedChar)        \
+    apply(-39, IllegalChar)          \
+    apply(-40, InvalidTableFormat)   \
+    apply(-41, BufferOverflow)       \
+    apply(-42, UnknownError)         \
+    apply(-43, NonScalarNumbered)    \
+    apply(-44, NumberedMoreThanArgc) \
+    apply(-45, InternalError)
+// clang-format on
 
 namespace Orvandeil::FileIO {
 

@@ -35,5 +35,6 @@ FILEIO_API std::string vxTextDetectCharset(const char* bytes, std::size_t count,
                                            vxConsoleSink& console, const std::u16string& fileName);
 
 // Reads one number by the host's number syntax from the start of [text, text + count), without
-// regard to any locale, and stores the bytes consumed (0: no number there).
+// regard to any locale, and stores the bytes consumed (0: no number there). A sign may stand in
+// front; a value too large is an infinity, one too small is 0.
 FILEIO_API double vxTextToDouble(const char* text, std::size_t count, std::size_t* consumed);

@@ -5,6 +5,7 @@
 #include "fileio/text/piecewise_format.h"
 
 #include <algorithm>
+#include <climits>
 #include <cstring>
 #include <utility>
 
@@ -36,7 +37,7 @@ unsigned long outputStringStream::PutNElements(unsigned long count, const void* 
 }
 
 int outputStringStream::print(const char* format, std::va_list arguments) {
-    int written = 0;
+    long written = 0;
     const auto put = [this, &written](const char* text, std::size_t count) {
         const int taken = PutASCIIString(text, static_cast<int>(count));
         written += taken;
@@ -44,7 +45,7 @@ int outputStringStream::print(const char* format, std::va_list arguments) {
         return static_cast<std::size_t>(taken) >= count;
     };
     const int length = detail::formatPiecewise(put, printScratch, format, arguments);
-    return length < 0 ? length : written;
+    return length < 0 ? length : static_cast<int>(std::min<long>(written, INT_MAX));
 }
 
 bool outputStringStream::EndOfData() {

@@ -46,7 +46,8 @@ bool holdsBack(const UConverter* converter, UErrorCode status) {
     return status == U_BUFFER_OVERFLOW_ERROR || ucnv_toUCountPending(converter, &ignored) != 0;
 }
 
-// Each pair becomes the one unit U+001A, each surrogate without its partner as well.
+// Each pair becomes the one unit U+001A. So does a high surrogate without its partner; a low one
+// disappears.
 unsigned long replacePairs(char16_t* units, unsigned long count) {
     char16_t* const end =
         std::remove_if(units, units + count, [](char16_t unit) { return U16_IS_TRAIL(unit); });
@@ -156,7 +157,13 @@ unsigned long TcodnStream::decodeInto(OutputBuffer& buffer, std::size_t& room,
                                       std::size_t& bytesConsumed) {
     auto* const out = static_cast<char16_t*>(buffer.Allocate(room));
     std::size_t bytes = 0;
-    const unsigned long units = GetNCodePoints(out, room, &bytes);
+    unsigned long units = 0;
+    try {
+        units = GetNCodePoints(out, room, &bytes);
+    } catch (...) {
+        buffer.SetLastChunkSize(0);
+        throw;
+    }
     buffer.SetLastChunkSize(units);
     bytesConsumed += bytes;
     return units;
