@@ -2,6 +2,7 @@
 #include "embedded/builtins/positioning.h"
 #include "embedded/builtins/print.h"
 #include "embedded/builtins/progress_line.h"
+#include "embedded/builtins/scan.h"
 #include "embedded/builtins/spool.h"
 #include "embedded/builtins/text_lines.h"
 #include "fileio/errors/code_list.h"
@@ -146,6 +147,7 @@ TEST(Lines, EndAtTerminatorsAndLimits) {
     const TempFile content;
     auto output = openFile(content.path(), {"w", "n", ""});
     EXPECT_EQ(codeOf([&] { readLine(*output); }), code::IsOpenWrite);
+    EXPECT_EQ(codeOf([&] { scan(*output, u"%d", SizeAttribute()); }), code::IsOpenWrite);
 }
 
 TEST(Print, WritesToFilesAndTellsFailures) {

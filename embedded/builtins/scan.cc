@@ -1,0 +1,116 @@
+#include "embedded/builtins/scan.h"
+
+#include "fileio/buffers/output_buffer.h"
+#include "fileio/errors/code_list.h"
+#include "fileio/scanf/scan_control.h"
+#include "fileio/text/input_string_stream.h"
+#include "fileio/text/output_string_stream.h"
+
+#include <algorithm>
+#include <array>
+#include <cstring>
+#include <iterator>
+#include <string_view>
+
+namespace Orvandeil::FileIO::embedded {
+namespace {
+
+constexpr std::size_t usualChunk = 1024;
+constexpr std::size_t largestChunk = 8388608;
+
+void padWithZeros(OutputBuffer& values, std::size_t missing) {
+    if (missing == 0) return;
+    void* const padding = values.Allocate(missing);
+    std::memset(padding, 0, missing * values.GetTypeSize());
+}
+
+// Unlike a binary read, a scan never drops rows that were asked for.
+ArrayPtr shaped(OutputBuffer& values, const SizeAttribute& size) {
+    const std::size_t count = values.GetSize();
+    if (count == 0) return ArrayPtr(values.TransferArray());
+    const std::size_t vectorRows = values.GetClassID() == vxCHAR_CLASS ? 1 : count;
+    const std::size_t rows = size.isMatrix ? size.m : vectorRows;
+    const std::size_t columns = (count - 1) / rows + 1;
+    padWithZeros(values, rows * columns - count);
+    ArrayPtr array(values.TransferArray());
+    vxArraySetRows(array.get(), rows);
+    vxArraySetColumns(array.get(), columns);
+    return array;
+}
+
+ScanResult scanStream(TcodnStream& stream, const std::u16string& format,
+                      const SizeAttribute& size) {
+    finFormatParser parser(format.c_str(), &stream);
+    parser.InitFormatPieces();
+    OutputBuffer values(parser.getResultClass(), usualChunk, usualChunk, largestChunk);
+    ScanResult result;
+    const unsigned long limit = size.isInfinite ? 0 : size.m * size.n;
+    scanControl control(limit, size.isInfinite, result.count, stream, parser, values);
+    control.performMainScan();
+    result.code = control.getError();
+    result.array = shaped(values, size);
+    return result;
+}
+
+bool isQuietEnd(int status, bool hasFileError) {
+    const bool isNearMiss = status == code::NoHelp && !hasFileError;
+    return status == 0 || status == code::MatchingFailure || isNearMiss;
+}
+
+// Asked without the stream, which would record that a pipe has no position.
+std::optional<long> positionIn(const OpenFile& file) {
+    const off_t position = ftello(file.handle.get());
+    return position < 0 ? std::nullopt : std::optional<long>(position);
+}
+
+// Where a decoder expects a byte order mark, text without one is big-endian to it. A mark would
+// stand in front of the first number.
+std::string encodingWithoutMark(const std::string& name) {
+    outputStringStream named(name.empty() ? "UTF-8" : name);
+    constexpr std::array<std::string_view, 2> marked = {"UTF-16", "UTF-32"};
+    UErrorCode status = U_ZERO_ERROR;
+    const std::string icuName = ucnv_getName(named.GetConv(0), &status);
+    return std::ranges::find(marked, icuName) == marked.end() ? icuName : icuName + "BE";
+}
+
+// Complete with what a stateful encoding ends a text with, which a stream leaves pending.
+std::string encoded(const std::u16string& text, const std::string& encoding) {
+    outputStringStream encoder(encodingWithoutMark(encoding));
+    std::string bytes;
+    const char16_t* next = text.data();
+    UErrorCode status;
+    do {
+        status = U_ZERO_ERROR;
+        char piece[4096];
+        char* target = piece;
+        ucnv_fromUnicode(encoder.GetConv(0), &target, std::end(piece), &next,
+                         text.data() + text.size(), nullptr, true, &status);
+        bytes.append(piece, target);
+    } while (status == U_BUFFER_OVERFLOW_ERROR);
+    return bytes;
+}
+
+}  // namespace
+
+ScanResult scan(OpenFile& file, const std::u16string& format, const SizeAttribute& size) {
+    // A stream that cannot be read from would deliver zeros for ever.
+    requireReadable(file);
+    beginTransfer(file, Direction::Reading);
+    ScanResult result = scanStream(*file.stream, format, size);
+    const bool hasFileError = std::ferror(file.handle.get()) != 0;
+    if (!isQuietEnd(result.code, hasFileError)) result.failure = file.failure(result.code);
+    result.position = positionIn(file);
+    return result;
+}
+
+ScanResult scanText(const std::u16string& text, const std::string& encoding,
+                    const std::u16string& format, const SizeAttribute& size) {
+    const std::string bytes = encoded(text, encoding);
+    inputStringStream stream(bytes.c_str(), static_cast<long>(bytes.size()), encoding);
+    ScanResult result = scanStream(stream, format, size);
+    if (!isQuietEnd(result.code, false)) result.failure = Failure{result.code, "text"};
+    result.position = static_cast<long>(stream.getUTF16Position());
+    return result;
+}
+
+}  // namespace Orvandeil::FileIO::embedded
