@@ -25,6 +25,7 @@ constexpr Kind kinds[] = {
     {"size", explainSize, ""},
     {"skip", explainSkip, ""},
     {"output-format", explainOutputFormat, "raw"},
+    {"scan-format", explainScanFormat, ""},
     {"code", explainCode, ""},
 };
 
@@ -72,6 +73,7 @@ constexpr char details[] =
     "  precision       the elements of a binary transfer: uint8=>char, *int16, ubit12\n"
     "  size, skip      a VALUE: how much to read, what to leave out between blocks\n"
     "  output-format   the format of printf\n"
+    "  scan-format     the format of scan\n"
     "  code            a numeric code: -8, or an errno number such as 2\n"
     "An invalid permission, machine format, precision, size or skip ends with exit status 1.\n";
 

@@ -17,6 +17,7 @@ Explain explainPrecision;
 Explain explainSize;
 Explain explainSkip;
 Explain explainOutputFormat;
+Explain explainScanFormat;
 Explain explainCode;
 
 // Whether an attribute validates; the report takes the error that it raises.

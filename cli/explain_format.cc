@@ -63,23 +63,6 @@ std::string conversionWords(const foutFormatPiece& piece) {
     return words + fieldWords("precision", piece.getPrecisionKind(), piece.getPrecisionValue());
 }
 
-// Control characters are shown as escapes, so that a piece stays one line.
-std::string quoted(std::u16string_view text) {
-    constexpr char16_t controls[] = u"\a\b\t\n\v\f\r";
-    constexpr char letters[] = "abtnvfr";
-    std::u16string shown;
-    for (const char16_t unit : text) {
-        const auto index = std::u16string_view(controls).find(unit);
-        if (index != std::u16string_view::npos) {
-            shown += u'\\';
-            shown += static_cast<char16_t>(letters[index]);
-        } else {
-            shown += unit < u' ' ? u'?' : unit;
-        }
-    }
-    return '"' + vxTextToNarrow(shown.data(), shown.size()) + '"';
-}
-
 void writePiece(JsonWriter& json, const foutFormatPiece& piece) {
     json.startObject();
     if (piece.getConversion() == NoConversion) {
