@@ -72,7 +72,7 @@ void JsonWriter::stringData(const vxArray& array) {
     if (!vxStringArrayIs(&array)) return;
     for (std::size_t i = 0; i < embedded::elementCount(array); ++i) {
         if (vxStringArrayIsMissing(&array, i)) {
-            writer.Null();
+            value(nullptr);
         } else {
             value(vxStringArrayText(&array, i));
         }

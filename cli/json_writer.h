@@ -44,6 +44,7 @@ public:
     void value(std::u16string_view text);
     void value(const std::string& text) { value(std::string_view(text)); }
     void value(const std::u16string& text) { value(std::u16string_view(text)); }
+    void value(std::nullptr_t) { writer.Null(); }
 
     void startList() { writer.StartArray(); }
     void endList() { writer.EndArray(); }

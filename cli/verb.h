@@ -25,6 +25,7 @@ struct Verb {
 inline constexpr std::size_t anyNumber = static_cast<std::size_t>(-1);
 
 extern const Verb printfVerb;
+extern const Verb scanVerb;
 extern const Verb readVerb;
 extern const Verb writeVerb;
 extern const Verb linesVerb;

@@ -3,8 +3,8 @@
 namespace cli {
 namespace {
 
-constexpr const Verb* verbs[] = {&printfVerb,  &readVerb,    &writeVerb,  &linesVerb,
-                                 &charsetVerb, &convertVerb, &explainVerb};
+constexpr const Verb* verbs[] = {&printfVerb, &scanVerb,    &readVerb,    &writeVerb,
+                                 &linesVerb,  &charsetVerb, &convertVerb, &explainVerb};
 
 constexpr Option commonOptions[] = {
     {"json", 0, nullptr, "print one JSON object instead of the plain output"},
