@@ -180,22 +180,24 @@ long Fields::width() {
 }
 
 std::string Fields::text(std::size_t tokens) {
-    static const std::string special[] = {
-        "-0", "0x", "-0x", "0X1", "inf", "-nan", "in",  "na", "INF",  "NaN",   "1e+",   "1e5",
-        "1.", ".5", "0b1", "-.",  "e-",  " -",   "0x.", "+0", "0x1e", "1e999", "e-999", "infinity"};
+    static const std::string special[] = {"-0",   "0x",    "-0x",   "0X1",     "inf", "-nan", "in",
+                                          "na",   "INF",   "NaN",   "1e+",     "1e5", "1.",   ".5",
+                                          "0b1",  "-.",    "e-",    " -",      "0x.", "+0",   "e+9",
+                                          "0x1e", "1e999", "e-999", "infinity"};
+    static const std::string ends[] = {
+        "9223372036854775807",   "9223372036854775808",    "-9223372036854775808",
+        "-9223372036854775809",  "18446744073709551615",   "18446744073709551616",
+        "-18446744073709551615", "-18446744073709551616",  "0x7fffffffffffffff",
+        "0x8000000000000000",    "0777777777777777777777", "01777777777777777777777"};
     static const std::string alphabet = " \t\n\0\xFF+-0017789aefinpx.,"s;
     std::string result;
     for (std::size_t i = 0; i < tokens; ++i) {
         const std::size_t kind = below(12);
-        if (kind < 2) {
-            result += special[below(std::size(special))];
-        } else if (kind == 2) {
-            result += std::string(20 + below(41), "0179af"[below(6)]);
-        } else if (kind == 3) {
-            result += std::to_string(random());
-        } else {
-            result += alphabet[below(alphabet.size())];
-        }
+        result += kind < 2    ? special[below(std::size(special))]
+                  : kind == 2 ? std::string(20 + below(41), "0179af"[below(6)])
+                  : kind == 3 ? std::to_string(random())
+                  : kind == 4 ? ends[below(std::size(ends))]
+                              : std::string(1, alphabet[below(alphabet.size())]);
     }
     return result;
 }

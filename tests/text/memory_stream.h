@@ -1,67 +1,55 @@
 #pragma once
 
-#include "fileio/text/tcodn_stream.h"
+#include "fileio/text/input_string_stream.h"
 
 #include <algorithm>
 #include <string>
-#include <utility>
+#include <string_view>
 #include <vector>
 
 namespace Orvandeil::FileIO {
 
-// A transcoding stream over strings, whose transfers can be cut short.
-class MemoryStream : public TcodnStream {
-public:
-    explicit MemoryStream(const std::string& encoding, std::string bytes = {})
-        : TcodnStream(encoding), input(std::move(bytes)) {}
+inline const char* const statelessEncodings[] = {"UTF-8",    "CESU-8",    "Shift_JIS",  "UTF-16LE",
+                                                 "UTF-16BE", "GB18030",   "ISO-8859-1", "US-ASCII",
+                                                 "EUC-JP",   "Big5-HKSCS"};
+// UTF-16 goes out as it is, and what a text in SCSU becomes depends on how it is cut.
+inline const char* const statefulEncodings[] = {"UTF-32", "ISO-2022-JP", "UTF-7", "SCSU", "UTF-16"};
+
+// Reads a text that the caller keeps, in one read never across `boundary`, and collects what is
+// written up to a limit.
+struct MemoryStream : inputStringStream {
+    explicit MemoryStream(const std::string& encoding, std::string_view bytes = "")
+        : inputStringStream(bytes.data(), std::ssize(bytes), encoding) {}
 
     using TcodnStream::CheckStatus;
 
-    std::string input;
-    std::size_t next = 0;
-    std::size_t boundary = 0;  // no read goes across it
+    unsigned long position() {
+        long bytes = -1;
+        getPosition(bytes);
+        return static_cast<unsigned long>(bytes);
+    }
+    unsigned long GetNElements(unsigned long count, char* buffer, unsigned long size) override {
+        if (position() < boundary) count = std::min(count, boundary - position());
+        return inputStringStream::GetNElements(count, buffer, size);
+    }
+    unsigned long PutNElements(unsigned long count, const void* buffer,
+                               unsigned long size) override {
+        ++writes;
+        count = std::min(count, (outputLimit - output.size()) / size);
+        output.append(static_cast<const char*>(buffer), count * size);
+        return count;
+    }
+    std::string DetectCharset(unsigned long startOffset) const override {
+        detections.push_back(startOffset);
+        return detected;
+    }
+
+    unsigned long boundary = 0;
     std::string output;
     std::size_t outputLimit = std::string::npos;
     int writes = 0;
     std::string detected = "UTF-8";
     mutable std::vector<unsigned long> detections;
-
-    int getPosition(long& position) override {
-        position = static_cast<long>(next);
-        return 0;
-    }
-    unsigned long GetNElements(unsigned long count, char* buffer, unsigned long) override {
-        const std::size_t end = next < boundary ? boundary : input.size();
-        count = std::min(count, end - next);
-        input.copy(buffer, count, next);
-        next += count;
-        return count;
-    }
-    unsigned long PutNElements(unsigned long count, const void* buffer,
-                               unsigned long elementSize) override {
-        ++writes;
-        const std::size_t room = (outputLimit - output.size()) / elementSize;
-        const unsigned long taken = std::min(count, room);
-        output.append(static_cast<const char*>(buffer), taken * elementSize);
-        return taken;
-    }
-    int print(const char*, std::va_list) override { return -1; }
-    bool EndOfData() override { return next == input.size(); }
-    bool Rewind(unsigned long count) override {
-        next -= count;
-        return true;
-    }
-    void setBufferSize(unsigned long) override {}
-    unsigned long scanOctal(long, int&, bool&) override { return 0; }
-    unsigned long scanHex(long, int&, bool&) override { return 0; }
-    unsigned long scanUnsignedInteger(long, int&, bool&) override { return 0; }
-    long scanInteger(long, int&) override { return 0; }
-    long scanIntegerCouldBeHex(long, int&) override { return 0; }
-    double scanFloat(long, int&) override { return 0; }
-    std::string DetectCharset(unsigned long startOffset) const override {
-        detections.push_back(startOffset);
-        return detected;
-    }
 };
 
 }  // namespace Orvandeil::FileIO
