@@ -6,135 +6,108 @@
 #include "tests/support/printing.h"
 #include "tests/support/scanning.h"
 
-#include <memory>
+#include <numeric>
 #include <string>
-#include <vector>
 
 #include <gtest/gtest.h>
 
 namespace {
 
 using namespace Orvandeil::FileIO;
+using fileio_tests::toUtf8;
 
 const char* const names[] = {"literal", "integer", "integerOrHex", "unsigned", "hex",  "octal",
                              "float",   "string",  "char",         "scanset",  "error"};
 
-// "integer(%5d) 5 6": kind, text, width, class; a "*" for a suppressed conversion.
-std::string describe(const finFormatPiece& piece) {
-    return std::string(names[static_cast<int>(piece.getFormat())]) + '(' +
-           fileio_tests::toUtf8(piece.getText()) + ')' + (piece.isSuppressed() ? "*" : "") + ' ' +
-           std::to_string(piece.getWidth()) + ' ' + std::to_string(piece.getClassID());
-}
-
-std::string describe(finFormatParser& parser) {
-    std::string all;
-    for (std::size_t i = 0; i < parser.getPieceCount(); ++i) {
-        int status = 1;
-        const finFormatPiece* piece = parser.fiPkGetScanFormatPiece(i, status);
-        EXPECT_EQ(status, 0);
-        all += (i == 0 ? "" : ", ") + describe(*piece);
-    }
-    return all;
-}
-
-struct Row {
-    int line;
-    const char* format;
-    const char* pieces;
-    int resultClass;
-    int error;
-};
-
-const Row rows[] = {
-    {__LINE__, "", "error() -1 4", 4, -8},
-    {__LINE__, "abc", "literal(abc) 0 4", 4, 0},
-    {__LINE__, "%d,%d", "integer(%d) -1 6, literal(,) 0 4, integer(%d) -1 6", 6, 0},
-    {__LINE__, "%*d", "integer(%d)* -1 6", 6, 0},
-    {__LINE__, "%*3ld", "integer(%3ld)* 3 14", 14, 0},
-    {__LINE__, "%99999999999d", "integer(%99999999999d) 2147483647 6", 6, 0},
-    {__LINE__, "%5.2f", "error(%5.2f) -1 4", 4, -8},
-    {__LINE__, "a%d%q", "literal(a) 0 4, integer(%d) -1 6, error(%q) -1 4", 6, -8},
-
-    // The order decides the class.
-    {__LINE__, "%s%ld", "string(%s) -1 4, integer(%ld) -1 14", 14, 0},
-    {__LINE__, "%ld%s", "integer(%ld) -1 14, string(%s) -1 4", 6, 0},
-    {__LINE__, "%ld%lu", "integer(%ld) -1 14, unsigned(%lu) -1 15", 6, 0},
-    {__LINE__, "%ld%li", "integer(%ld) -1 14, integerOrHex(%li) -1 14", 14, 0},
-    {__LINE__, "%lo,%lx", "octal(%lo) -1 15, literal(,) 0 4, hex(%lx) -1 15", 15, 0},
-    {__LINE__, "%*d%ld", "integer(%d)* -1 6, integer(%ld) -1 14", 6, 0},
-    {__LINE__, "%c%[a]", "char(%c) -1 4, scanset(%[a]) -1 4", 4, 0},
-
-    // Sets.
-    {__LINE__, "%[]a]", "scanset(%[]a]) -1 4", 4, 0},
-    {__LINE__, "%[^]a]b", "scanset(%[^]a]) -1 4, literal(b) 0 4", 4, 0},
-    {__LINE__, "%*3[^a]", "scanset(%3[^a])* 3 4", 4, 0},
-    {__LINE__, "%[a^]]", "scanset(%[a^]) -1 4, literal(]) 0 4", 4, 0},
-    {__LINE__, "%[%]", "scanset(%[%]) -1 4", 4, 0},
-    {__LINE__, "%[]", "error(%[]) -1 4", 4, -8},
-    {__LINE__, "%[^]", "error(%[^]) -1 4", 4, -8},
-    {__LINE__, "%[^", "error(%[^) -1 4", 4, -8},
-
-    // Percent signs.
-    {__LINE__, "a%%b", "literal(a%%b) 0 4", 4, 0},
-    {__LINE__, "a%%%d", "literal(a%%) 0 4, integer(%d) -1 6", 6, 0},
-    {__LINE__, "%%", "literal(%%) 0 4", 4, 0},
-    {__LINE__, "%%a", "literal(%%) 0 4, literal(a) 0 4", 4, 0},
-    {__LINE__, "%%%d", "literal(%%) 0 4, integer(%d) -1 6", 6, 0},
-    {__LINE__, "%%a%d", "literal(%%a%d) 0 4", 4, 0},
-    {__LINE__, "%d%% %d", "integer(%d) -1 6, literal(%% %d) 0 4", 6, 0},
-    {__LINE__, "%%, %d", "literal(%%) 0 4, literal(, ) 0 4, integer(%d) -1 6", 6, 0},
-    {__LINE__, "%%a%%d", "integer(%%a%%d) -1 6", 6, 0},
-    {__LINE__, "%%a%%*2[x]", "scanset(%%a%%2[x])* 2 4", 4, 0},
-    {__LINE__, "%%a%", "error(%%a%) -1 4", 4, -8},
-    {__LINE__, "%%%", "literal(%%) 0 4, error(%) -1 4", 4, -8},
-    {__LINE__, "%%%%", "error(%%%%) -1 4", 4, -8},
-};
-
-TEST(FinFormatParser, Pieces) {
-    for (const Row& row : rows) {
-        SCOPED_TRACE(row.line);
-        const std::u16string format = fileio_tests::toUtf16(row.format);
-        finFormatParser parser(format.c_str(), nullptr);
+struct Parsed {
+    explicit Parsed(const std::u16string& format, TcodnStream* input = nullptr)
+        : parser(format.c_str(), input) {
         parser.InitFormatPieces();
-        EXPECT_EQ(describe(parser), row.pieces);
-        EXPECT_EQ(parser.getResultClass(), row.resultClass);
-        EXPECT_EQ(parser.getError(), row.error);
+    }
+    finFormatPiece& piece(std::size_t index) {
+        int status = 1;
+        finFormatPiece* found = parser.fiPkGetScanFormatPiece(index, status);
+        EXPECT_EQ(status, 0);
+        return *found;
+    }
+    finFormatParser parser;
+};
+
+// "integer(%5d)5": kind, text, width; a "*" for a suppressed conversion.
+std::string describe(const finFormatPiece& piece) {
+    return names[static_cast<int>(piece.getFormat())] + ('(' + toUtf8(piece.getText())) + ')' +
+           (piece.isSuppressed() ? "*" : "") +
+           (piece.getWidth() > 0 ? std::to_string(piece.getWidth()) : "");
+}
+
+// What each piece is, the class of the result, the error.
+TEST(FinFormatParser, Pieces) {
+    const struct {
+        int line;
+        const char* format;
+        const char* expected;
+    } rows[] = {
+        {__LINE__, "", "error() 4 -8"},
+        {__LINE__, "%d,%*d", "integer(%d) literal(,) integer(%d)* 6 0"},
+        {__LINE__, "%*3ld", "integer(%3ld)*3 14 0"},
+        {__LINE__, "%99999999999d", "integer(%99999999999d)2147483647 6 0"},
+        {__LINE__, "%5.2f", "error(%5.2f) 4 -8"},
+        {__LINE__, "a%d%q", "literal(a) integer(%d) error(%q) 6 -8"},
+        // The order decides the class.
+        {__LINE__, "%s%ld", "string(%s) integer(%ld) 14 0"},
+        {__LINE__, "%ld%s", "integer(%ld) string(%s) 6 0"},
+        {__LINE__, "%ld%lu", "integer(%ld) unsigned(%lu) 6 0"},
+        {__LINE__, "%*d%ld", "integer(%d)* integer(%ld) 6 0"},
+        // Sets.
+        {__LINE__, "%[]a]", "scanset(%[]a]) 4 0"},
+        {__LINE__, "%[^]a]b", "scanset(%[^]a]) literal(b) 4 0"},
+        {__LINE__, "%*3[a^]]", "scanset(%3[a^])*3 literal(]) 4 0"},
+        {__LINE__, "%[]", "error(%[]) 4 -8"},
+        {__LINE__, "%[^]", "error(%[^]) 4 -8"},
+        // Percent signs.
+        {__LINE__, "a%%%d", "literal(a%%) integer(%d) 6 0"},
+        {__LINE__, "%%a", "literal(%%) literal(a) 4 0"},
+        {__LINE__, "%%%d", "literal(%%) integer(%d) 6 0"},
+        {__LINE__, "%%a%d", "literal(%%a%d) 4 0"},
+        {__LINE__, "%d%% %d", "integer(%d) literal(%% %d) 6 0"},
+        {__LINE__, "%%a%%d", "integer(%%a%%d) 6 0"},
+        {__LINE__, "%%a%%*2[x]", "scanset(%%a%%2[x])*2 4 0"},
+        {__LINE__, "%%%", "literal(%%) error(%) 4 -8"},
+        {__LINE__, "%%%%", "error(%%%%) 4 -8"},
+    };
+    for (const auto& row : rows) {
+        Parsed parsed(fileio_tests::toUtf16(row.format));
+        std::string found;
+        for (std::size_t i = 0; i < parsed.parser.getPieceCount(); ++i)
+            found += describe(parsed.piece(i)) + ' ';
+        found += std::to_string(parsed.parser.getResultClass()) + ' ' +
+                 std::to_string(parsed.parser.getError());
+        EXPECT_EQ(found, row.expected) << "line " << row.line;
     }
 }
 
 // Every letter with every length letter: what it reads, and into which class.
 TEST(FinFormatParser, Conversions) {
-    struct {
-        const char16_t* letters;
-        FORMAT format;
-        int classes[3];  // without a length letter, with h, with l; 0: not allowed
-    } const conversions[] = {
-        {u"d", FORMAT::Integer, {6, 6, 14}},  {u"i", FORMAT::IntegerOrHex, {6, 6, 14}},
-        {u"u", FORMAT::Unsigned, {6, 6, 15}}, {u"xX", FORMAT::Hex, {6, 6, 15}},
-        {u"o", FORMAT::Octal, {6, 6, 15}},    {u"efgEG", FORMAT::Float, {6, 6, 6}},
-        {u"s", FORMAT::String, {4, 0, 0}},    {u"c", FORMAT::Char, {4, 0, 0}},
-    };
-    const std::u16string lengths[] = {u"", u"h", u"l"};
-    for (char16_t letter = 1; letter < 0x180; ++letter) {
-        if (std::u16string_view(u"hl%*-[0123456789").find(letter) != std::u16string_view::npos)
-            continue;
-        for (std::size_t length = 0; length < 3; ++length) {
-            FORMAT wanted = FORMAT::Error;
-            int wantedClass = 4;
-            for (const auto& row : conversions) {
-                const std::u16string_view letters = row.letters;
-                if (letters.find(letter) == letters.npos || row.classes[length] == 0) continue;
-                wanted = row.format;
-                wantedClass = row.classes[length];
-            }
-            const std::u16string format = u"%" + lengths[length] + letter;
-            finFormatParser parser(format.c_str(), nullptr);
-            parser.InitFormatPieces();
-            int status = 0;
-            const finFormatPiece* piece = parser.fiPkGetScanFormatPiece(0, status);
-            EXPECT_EQ(piece->getFormat(), wanted) << fileio_tests::toUtf8(format);
-            EXPECT_EQ(piece->getClassID(), wantedClass) << fileio_tests::toUtf8(format);
-            EXPECT_EQ(parser.getError(), wanted == FORMAT::Error ? code::InvalidFormat : 0);
+    const std::u16string letters = u"diuxXoefgEGsc", prefixes = u"hl%*-[0123456789";
+    const FORMAT formats[] = {
+        FORMAT::Integer, FORMAT::IntegerOrHex, FORMAT::Unsigned, FORMAT::Hex,   FORMAT::Hex,
+        FORMAT::Octal,   FORMAT::Float,        FORMAT::Float,    FORMAT::Float, FORMAT::Float,
+        FORMAT::Float,   FORMAT::String,       FORMAT::Char};
+    for (const std::u16string length : {u"", u"h", u"l"}) {
+        for (char16_t letter = 1; letter < 0x180; ++letter) {
+            if (prefixes.find(letter) != prefixes.npos) continue;
+            const std::size_t at = letters.find(letter);
+            const bool isNumber = at < 11;
+            const bool isKnown = isNumber || (at != letters.npos && length.empty());
+            const int wide = at < 2 ? vxINT64_CLASS : at < 6 ? vxUINT64_CLASS : vxDOUBLE_CLASS;
+            Parsed parsed(u"%" + length + letter);
+            const finFormatPiece& piece = parsed.piece(0);
+            SCOPED_TRACE(toUtf8(piece.getText()));
+            EXPECT_EQ(piece.getFormat(), isKnown ? formats[at] : FORMAT::Error);
+            EXPECT_EQ(piece.getClassID(), !isNumber        ? vxCHAR_CLASS
+                                          : length == u"l" ? wide
+                                                           : vxDOUBLE_CLASS);
+            EXPECT_EQ(parsed.parser.getError(), isKnown ? 0 : code::InvalidFormat);
         }
     }
 }
@@ -143,92 +116,75 @@ TEST(FinFormatParser, Conversions) {
 // Every format can be run.
 void checkFormat(const std::u16string& format) {
     const std::string input = "12 %a 0x1f]-%";
-    inputStringStream stream(input.c_str(), static_cast<long>(input.size()), "");
-    finFormatParser parser(format.c_str(), &stream);
-    parser.InitFormatPieces();
+    inputStringStream stream(input.c_str(), std::ssize(input), "");
+    Parsed parsed(format, &stream);
     std::size_t units = 0;
-    const std::size_t count = parser.getPieceCount();
+    const std::size_t count = parsed.parser.getPieceCount();
     for (std::size_t i = 0; i < count; ++i) {
-        int status = 0;
-        const finFormatPiece* piece = parser.fiPkGetScanFormatPiece(i, status);
-        units += piece->getText().size() + (piece->isSuppressed() ? 1 : 0);
-        const bool isError = piece->getFormat() == FORMAT::Error;
-        ASSERT_EQ(isError, parser.getError() != 0 && i + 1 == count);
+        const finFormatPiece& piece = parsed.piece(i);
+        units += piece.getText().size() + (piece.isSuppressed() ? 1 : 0);
+        const bool isError = piece.getFormat() == FORMAT::Error;
+        ASSERT_EQ(isError, parsed.parser.getError() != 0 && i + 1 == count);
     }
-    ASSERT_EQ(units, format.size()) << fileio_tests::toUtf8(format);
-    const support::Scanned scanned =
-        support::scan(stream, fileio_tests::toUtf8(format), support::unlimited);
-    ASSERT_TRUE(scanned.code == 0 || scanned.code == -9 || scanned.code == -8)
-        << fileio_tests::toUtf8(format) << " gives " << scanned.code;
+    ASSERT_EQ(units, format.size()) << toUtf8(format);
+    const int code = support::scan(stream, toUtf8(format), support::unlimited).code;
+    ASSERT_TRUE(code == 0 || code == -9 || code == -8) << toUtf8(format) << " gives " << code;
+}
+
+// Every format that goes on behind `format` with up to `more` characters of the alphabet.
+void checkFormats(const std::u16string& alphabet, const std::u16string& format, int more) {
+    if (!format.empty()) checkFormat(format);
+    for (std::size_t i = 0; more > 0 && i < alphabet.size(); ++i)
+        checkFormats(alphabet, format + alphabet[i], more - 1);
 }
 
 TEST(FinFormatParser, EveryShortFormat) {
-    for (char16_t first = 1; first < 128; ++first) {
-        checkFormat(std::u16string(u"%") + first);
-        for (char16_t second = 1; second < 128; ++second)
-            checkFormat(std::u16string(u"%") + first + second);
-    }
-    const std::u16string special = u"%*d5[]^-l";
-    std::size_t total = 1;
-    for (std::size_t length = 1; length <= 5; ++length) {
-        total *= special.size();
-        for (std::size_t number = 0; number < total; ++number) {
-            std::u16string format;
-            for (std::size_t rest = number; format.size() < length; rest /= special.size())
-                format += special[rest % special.size()];
-            checkFormat(format);
-        }
-    }
+    std::u16string ascii(127, u'\0');
+    std::iota(ascii.begin(), ascii.end(), u'\1');
+    checkFormats(ascii, u"%", 2);
+    checkFormats(u"%*d5[]^-l", u"", 5);
 }
 
 TEST(FinFormatParser, HandsPiecesOutOverAndOver) {
-    finFormatParser parser(u"%d,%d", nullptr);
-    parser.InitFormatPieces();
+    Parsed parsed(u"%d,%d");
     int status = 7;
-    finFormatPiece* const first = parser.fiPkGetNextScanFormatPiece(status);
-    EXPECT_EQ(status, 0);
-    parser.fiPkGetNextScanFormatPiece(status);
-    parser.fiPkGetNextScanFormatPiece(status);
-    EXPECT_EQ(parser.getNextIndex(), parser.getPieceCount());
-    EXPECT_FALSE(parser.isRecycled());
-    EXPECT_EQ(parser.fiPkGetNextScanFormatPiece(status), first);
-    EXPECT_TRUE(parser.isRecycled());
-    EXPECT_EQ(parser.fiPkGetScanFormatPiece(3, status), nullptr);
+    for (std::size_t i = 0; i < 3; ++i) {
+        EXPECT_EQ(parsed.parser.fiPkGetNextScanFormatPiece(status), &parsed.piece(i));
+        EXPECT_EQ(status, 0);
+    }
+    EXPECT_EQ(parsed.parser.getNextIndex(), 3u);
+    EXPECT_FALSE(parsed.parser.isRecycled());
+    EXPECT_EQ(parsed.parser.fiPkGetNextScanFormatPiece(status), &parsed.piece(0));
+    EXPECT_TRUE(parsed.parser.isRecycled());
+    EXPECT_EQ(parsed.parser.fiPkGetScanFormatPiece(3, status), nullptr);
     EXPECT_EQ(status, 45);
 }
 
-TEST(FinFormatParser, ClonesOutliveTheirOriginals) {
-    inputStringStream stream("5cab", 4, "");
-    OutputBuffer result(vxDOUBLE_CLASS, 4, 4, 4);
+TEST(FinFormatParser, ClonesOutliveTheirParser) {
+    inputStringStream stream("cab12", 5, "");
+    auto parsed = std::make_unique<Parsed>(u"%2[c-a]b%*5d%q", &stream);
     std::vector<std::unique_ptr<finFormatPiece>> clones;
-    std::string originals;
-    {
-        finFormatParser parser(u"%hd%2[c-a]bä%*s%3c%q", &stream);
-        parser.InitFormatPieces();
-        originals = describe(parser);
-        for (std::size_t i = 0; i < parser.getPieceCount(); ++i) {
-            int status = 0;
-            finFormatPiece* piece = parser.fiPkGetScanFormatPiece(i, status);
-            const bool isAscii = i != 2;
-            EXPECT_EQ(piece->getAsciiText() != nullptr, isAscii);
-            clones.push_back(piece->clone());
-            EXPECT_NE(clones.back()->getText().data(), piece->getText().data());
-            EXPECT_EQ(clones.back()->getAsciiText() != nullptr, isAscii);
-        }
+    std::vector<std::string> originals;
+    for (std::size_t i = 0; i < parsed->parser.getPieceCount(); ++i) {
+        if (i != 1) parsed->piece(i).getAsciiText();
+        clones.push_back(parsed->piece(i).clone());
+        originals.push_back(describe(parsed->piece(i)));
     }
-    const int statuses[] = {0, 0, 0, 0, 0, code::InvalidFormat};
-    std::string copies;
+    parsed.reset();
+    OutputBuffer result(vxCHAR_CLASS, 4, 4, 4);
     for (std::size_t i = 0; i < clones.size(); ++i) {
         int status = 0;
         bool failed = false;
         clones[i]->scan(stream, result, false, failed, status);
-        EXPECT_EQ(status, statuses[i]);
-        EXPECT_EQ(failed, i >= 2);
-        copies += (i == 0 ? "" : ", ") + describe(*clones[i]);
+        EXPECT_EQ(status, i < 3 ? 0 : code::InvalidFormat);
+        EXPECT_EQ(failed, i == 3);
+        EXPECT_EQ(clones[i]->isLiteral(), i == 1);
+        EXPECT_EQ(describe(*clones[i]), originals[i]);
+        EXPECT_EQ(clones[i]->getAsciiText(), toUtf8(clones[i]->getText()));
     }
-    EXPECT_EQ(copies, originals);
-    EXPECT_EQ(result.GetSize(), 3u);
+    EXPECT_EQ(result.GetSize(), 2u);
     EXPECT_TRUE(stream.EndOfData());
+    EXPECT_EQ(Parsed(u"ä").piece(0).getAsciiText(), nullptr);
 }
 
 }  // namespace
