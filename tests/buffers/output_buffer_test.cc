@@ -43,8 +43,8 @@ public:
 
     void step() {
         const std::function<void()> steps[] = {
-            [this] { fill(upTo(12)); },
-            [this] { fill(upTo(12)); },
+            [this] { fill(); },
+            [this] { fill(); },
             [this] { appendConverted(); },
             [this] { appendAnother(); },
             [this] { appendItself(); },
@@ -52,38 +52,32 @@ public:
             [this] { flip(); },
             [this] { rollBack(); },
             [this] { rollBack(); },
-            [this] { takeAll(); },
-        };
-        steps[upTo(upTo(9))]();
+            [this] { takeAll(); }};
+        steps[upTo(9)]();
         ASSERT_EQ(buffer.GetSize(), model.size());
         ASSERT_EQ(contents(buffer), model);
     }
 
 private:
     std::size_t upTo(std::size_t most) { return random() % (most + 1); }
-    std::uint16_t unit() { return static_cast<std::uint16_t>(random()); }
 
-    void fill(std::size_t asked) {
+    void fill() {
+        const std::size_t asked = upTo(12), used = upTo(asked);
         std::size_t n = asked;
         auto* room = static_cast<char*>(buffer.Allocate(n));
         ASSERT_EQ(n, asked);
-        const std::size_t used = upTo(asked);
-        for (std::size_t i = 0; i < asked; ++i) {
-            const std::uint16_t value = unit();
-            std::memcpy(room + i * sizeof value, &value, sizeof value);
-            if (i < used) model.push_back(value);
-        }
+        Units units(asked);
+        std::generate(units.begin(), units.end(), std::ref(random));
+        std::memcpy(room, units.data(), 2 * asked);
+        model.insert(model.end(), units.begin(), units.begin() + static_cast<std::ptrdiff_t>(used));
         buffer.SetLastChunkSize(used);
     }
 
     void appendConverted() {
         const double values[] = {-1, 2.5, 70000};
-        const Units converted = {0, 3, 65535};
-        const void* start = buffer.AppendData(vxDOUBLE_CLASS, values, 3);
-        ASSERT_EQ(unitAt(start), 0);
-        model.insert(model.end(), converted.begin(), converted.end());
+        ASSERT_EQ(unitAt(buffer.AppendData(vxDOUBLE_CLASS, values, 3)), 0);
         buffer.AppendScalar(static_cast<int>(upTo(9)) - 10);
-        model.push_back(0);
+        model.insert(model.end(), {0, 3, 65535, 0});
     }
 
     void appendAnother() {
@@ -115,19 +109,19 @@ private:
         const Units before = model;
         const std::size_t fills = upTo(3);
         for (std::size_t i = 0; i < fills; ++i)
-            fill(upTo(12));
+            fill();
         buffer.Rollback();
         model = fills == 0 ? Units() : before;
         if (upTo(1) == 0 || fills == 0) return;
-        fill(upTo(12));
+        fill();
         buffer.Rollback();
         model = before;
     }
 
     void takeAll() {
         const boost::shared_ptr<void> block = buffer.Transfer();
-        for (std::size_t i = 0; i < model.size(); ++i)
-            ASSERT_EQ(unitAt(static_cast<std::uint16_t*>(block.get()) + i), model[i]);
+        const auto* units = static_cast<const std::uint16_t*>(block.get());
+        ASSERT_EQ(Units(units, units + model.size()), model);
         model.clear();
     }
 
@@ -147,32 +141,23 @@ TEST(OutputBuffer, HoldsWhatRandomOperationsPutIn) {
 }
 
 TEST(OutputBuffer, NormalisesAndGrowsItsCapacity) {
-    const struct {
-        int line;
-        std::size_t initial, min, max, first;
-        std::vector<std::size_t> grown;
-    } rows[] = {
-        {__LINE__, 0, 0, 0, 1, {1, 1}},
-        {__LINE__, 0, 4, 0, 4, {4, 4}},
-        {__LINE__, 8, 2, 40, 8, {16, 32, 40, 40}},
-        {__LINE__, 1, 6, 3, 1, {6, 6}},
-        {__LINE__, SIZE_MAX, 1, SIZE_MAX, SIZE_MAX, {SIZE_MAX}},
-    };
-    for (const auto& row : rows) {
-        OutputBuffer buffer(vxDOUBLE_CLASS, row.initial, row.min, row.max);
-        EXPECT_EQ(buffer.GetCurrentCapacity(), row.first) << row.line;
-        for (const std::size_t expected : row.grown)
-            EXPECT_EQ(buffer.SetCurrentCapacity(0, true), expected) << row.line;
-        const std::size_t min = std::max<std::size_t>(row.min, 1);
-        EXPECT_EQ(buffer.SetCurrentCapacity(0, false), min) << row.line;
+    // The capacities at first, grown, again, not grown, and behind a request of five elements.
+    const auto capacities = [](std::size_t initial, std::size_t min, std::size_t max) {
+        OutputBuffer buffer(vxDOUBLE_CLASS, initial, min, max);
+        std::vector<std::size_t> found = {buffer.GetCurrentCapacity()};
+        for (const bool grow : {true, true, true, false})
+            found.push_back(buffer.SetCurrentCapacity(0, grow));
         std::size_t n = 5;
         buffer.Allocate(n);
-        EXPECT_EQ(buffer.GetCurrentCapacity(), std::max<std::size_t>(min, 5)) << row.line;
-    }
-    OutputBuffer cells(vxCELL_CLASS, 1, 1, 1);
-    EXPECT_EQ(cells.GetTypeSize(), 1u);
-    EXPECT_EQ(cells.AppendData(vxDOUBLE_CLASS, "12345678", 1), nullptr);
-    EXPECT_EQ(cells.GetSize(), 0u);
+        found.push_back(buffer.GetCurrentCapacity());
+        return found;
+    };
+    using Sizes = std::vector<std::size_t>;
+    EXPECT_EQ(capacities(0, 4, 0), (Sizes{4, 4, 4, 4, 4, 5}));
+    EXPECT_EQ(capacities(8, 2, 40), (Sizes{8, 16, 32, 40, 2, 5}));
+    EXPECT_EQ(capacities(1, 6, 3), (Sizes{1, 6, 6, 6, 6, 6}));
+    EXPECT_EQ(capacities(SIZE_MAX, 1, SIZE_MAX),
+              (Sizes{SIZE_MAX, SIZE_MAX, SIZE_MAX, SIZE_MAX, 1, 5}));
 }
 
 TEST(OutputBuffer, KeepsItsEndsStraight) {
@@ -182,6 +167,9 @@ TEST(OutputBuffer, KeepsItsEndsStraight) {
     EXPECT_EQ(buffer.TransferRaw(), nullptr);
     std::size_t n = 10;
     buffer.Allocate(n);
+    for (std::size_t tooMuch : {SIZE_MAX, SIZE_MAX / 2 + 1})
+        EXPECT_EQ(fileio_tests::raisedBy([&] { buffer.Allocate(tooMuch); }),
+                  "KESTRA:legacy_two_part:p64bitsize");
     buffer.SetLastChunkSize(3);
     EXPECT_EQ(buffer.GetSize(), 3u);
     buffer.SetLastChunkSize(3);  // once too often: takes away as much again
@@ -193,12 +181,12 @@ TEST(OutputBuffer, KeepsItsEndsStraight) {
     buffer.AppendScalar(static_cast<unsigned short>(7));
     EXPECT_EQ(unitAt(buffer.GetNext()), 7);
 
-    n = 0;
-    OutputBuffer empty(vxUINT16_CLASS, 1, 1, 1);
-    empty.Allocate(n);
-    void* block = empty.TransferRaw();
-    EXPECT_NE(block, nullptr);
-    empty.FreeMem(block);
+    OutputBuffer cells(vxCELL_CLASS, 1, 1, 1);
+    EXPECT_EQ(cells.AppendData(vxDOUBLE_CLASS, "12345678", 1), nullptr);
+    EXPECT_EQ(cells.GetSize(), 0u);
+    void* block = cells.TransferRaw();
+    EXPECT_NE(block, nullptr) << "there is a chunk, though nothing in it";
+    cells.FreeMem(block);
 }
 
 template <class T>
@@ -218,69 +206,56 @@ TEST(OutputBuffer, AppendsScalarsOfTheirOwnClass) {
 }
 
 TEST(OutputBuffer, FlipsElementsOfEverySize) {
-    const char bytes[] = "12345678";
-    const struct {
-        vxClassID classID;
-        const char* flipped;
-    } rows[] = {{vxINT8_CLASS, "12345678"},
-                {vxCHAR_CLASS, "21436587"},
-                {vxSINGLE_CLASS, "43218765"},
-                {vxUINT64_CLASS, "87654321"}};
-    for (const auto& row : rows) {
-        OutputBuffer buffer(row.classID, 0, 0, 0);
-        buffer.AppendData(row.classID, bytes, 8 / buffer.GetTypeSize());
+    for (const vxClassID classID : {vxINT8_CLASS, vxCHAR_CLASS, vxSINGLE_CLASS, vxUINT64_CLASS}) {
+        std::string bytes = "12345678";
+        OutputBuffer buffer(classID, 0, 0, 0);
+        const std::size_t size = buffer.GetTypeSize();
+        buffer.AppendData(classID, bytes.data(), 8 / size);
         buffer.FlipBytes();
-        const boost::shared_ptr<void> block = buffer.Transfer();
-        EXPECT_EQ(std::memcmp(block.get(), row.flipped, 8), 0) << row.flipped;
+        for (auto at = bytes.begin(); at != bytes.end(); at += static_cast<std::ptrdiff_t>(size))
+            std::reverse(at, at + static_cast<std::ptrdiff_t>(size));
+        EXPECT_EQ(std::memcmp(buffer.Transfer().get(), bytes.data(), 8), 0) << bytes;
     }
 }
 
-TEST(OutputBuffer, ShapesWhatItHandsOver) {
-    const struct {
-        int line;
-        vxClassID classID;
-        std::size_t count;
-        std::vector<double> size;  // empty: unshaped
-        bool countInBytes;
-        std::size_t rows, columns;
-    } rows[] = {
-        {__LINE__, vxDOUBLE_CLASS, 0, {}, false, 0, 0},
-        {__LINE__, vxDOUBLE_CLASS, 5, {}, false, 1, 5},
-        {__LINE__, vxCHAR_CLASS, 5, {}, false, 1, 5},
-        {__LINE__, vxDOUBLE_CLASS, 10, {4}, false, 4, 3},
-        {__LINE__, vxDOUBLE_CLASS, 0, {4}, false, 0, 0},
-        {__LINE__, vxDOUBLE_CLASS, 3, {9}, false, 3, 1},
-        {__LINE__, vxDOUBLE_CLASS, 1, {9}, false, 1, 1},
-        {__LINE__, vxDOUBLE_CLASS, 7, {HUGE_VAL}, false, 7, 1},
-        {__LINE__, vxDOUBLE_CLASS, 4, {1, 4}, false, 4, 1},
-        {__LINE__, vxDOUBLE_CLASS, 3, {4, 2}, false, 3, 1},
-        {__LINE__, vxDOUBLE_CLASS, 5, {2, HUGE_VAL}, false, 2, 3},
-        {__LINE__, vxDOUBLE_CLASS, 2, {0, 0}, false, 2, 1},
-        {__LINE__, vxCHAR_CLASS, 5, {2}, false, 5, 1},
-        {__LINE__, vxCHAR_CLASS, 5, {2, 3}, false, 2, 3},
-        {__LINE__, vxINT8_CLASS, 10, {4}, true, 4, 3},
-        {__LINE__, vxDOUBLE_CLASS, 10, {1, HUGE_VAL}, true, 2, 1},
-        {__LINE__, vxUINT16_CLASS, 10, {2, 3}, true, 2, 3},
-    };
-    for (const auto& row : rows) {
-        for (const std::size_t piece : {1u, 3u, 100u}) {
-            OutputBuffer buffer(row.classID, 0, 1, 0);
-            for (std::size_t i = 0; i < row.count; i += piece) {
-                const Units ones(std::min(piece, row.count - i), 1);
-                buffer.AppendData(vxUINT16_CLASS, ones.data(), ones.size());
-            }
-            const ArrayPtr size = embedded::makeDoubles(1, row.size.size(), row.size);
-            const ArrayPtr array(row.size.empty() ? buffer.TransferArray()
-                                                  : buffer.TransferArray(SizeAttribute(size.get()),
-                                                                         row.countInBytes));
-            EXPECT_EQ(vxArrayClassID(array.get()), row.classID) << row.line;
-            EXPECT_EQ(vxArrayDimensions(array.get())[0], row.rows) << row.line;
-            EXPECT_EQ(vxArrayDimensions(array.get())[1], row.columns) << row.line;
-            for (std::size_t i = 0; i < row.rows * row.columns; ++i)
-                EXPECT_EQ(VxData(array.get()).getIndexAs<double>(i), i < row.count) << row.line;
-            EXPECT_EQ(buffer.GetSize(), 0u);
+// Hands `count` ones over, filled in by pieces: "rows x columns" of the array they become. It has
+// zeros behind them.
+std::string shapeOf(vxClassID classID, std::size_t count, std::vector<double> size,
+                    bool countInBytes = false) {
+    std::string shape;
+    for (const std::size_t piece : {1u, 3u, 100u}) {
+        OutputBuffer buffer(classID, 0, 1, 0);
+        for (std::size_t i = 0; i < count; i += piece) {
+            const Units ones(std::min(piece, count - i), 1);
+            buffer.AppendData(vxUINT16_CLASS, ones.data(), ones.size());
         }
+        const SizeAttribute asked(embedded::makeDoubles(1, size.size(), size).get());
+        const ArrayPtr array(size.empty() ? buffer.TransferArray()
+                                          : buffer.TransferArray(asked, countInBytes));
+        EXPECT_EQ(vxArrayClassID(array.get()), classID);
+        const std::size_t* lengths = vxArrayDimensions(array.get());
+        for (std::size_t i = 0; i < lengths[0] * lengths[1]; ++i)
+            EXPECT_EQ(VxData(array.get()).getIndexAs<double>(i), i < count);
+        EXPECT_EQ(buffer.GetSize(), 0u);
+        const std::string found = std::to_string(lengths[0]) + 'x' + std::to_string(lengths[1]);
+        EXPECT_TRUE(shape.empty() || shape == found) << "in pieces of " << piece;
+        shape = found;
     }
+    return shape;
+}
+
+TEST(OutputBuffer, ShapesWhatItHandsOver) {
+    EXPECT_EQ(shapeOf(vxDOUBLE_CLASS, 0, {}), "0x0");
+    EXPECT_EQ(shapeOf(vxDOUBLE_CLASS, 5, {}), "1x5");
+    EXPECT_EQ(shapeOf(vxDOUBLE_CLASS, 10, {4}), "4x3");
+    EXPECT_EQ(shapeOf(vxDOUBLE_CLASS, 7, {HUGE_VAL}), "7x1");
+    EXPECT_EQ(shapeOf(vxDOUBLE_CLASS, 4, {1, 4}), "4x1");
+    EXPECT_EQ(shapeOf(vxDOUBLE_CLASS, 5, {2, HUGE_VAL}), "2x3");
+    EXPECT_EQ(shapeOf(vxDOUBLE_CLASS, 2, {0, 0}), "2x1");
+    EXPECT_EQ(shapeOf(vxCHAR_CLASS, 5, {2}), "5x1");
+    EXPECT_EQ(shapeOf(vxCHAR_CLASS, 5, {2, 3}), "2x3");
+    EXPECT_EQ(shapeOf(vxDOUBLE_CLASS, 10, {1, HUGE_VAL}, true), "2x1");
+    EXPECT_EQ(shapeOf(vxUINT16_CLASS, 10, {2, 3}, true), "2x3");
 }
 
 // Every operation that takes memory, on an empty buffer and on one of one and of several chunks,
@@ -296,43 +271,27 @@ TEST(OutputBuffer, IsUnchangedWhenMemoryRunsOut) {
         [&](OutputBuffer& b) { b.FreeMem(b.TransferRaw()); },
         [&](OutputBuffer& b) { b.Transfer(); },
         [&](OutputBuffer& b) { ArrayPtr(b.TransferArray()); },
-        [&](OutputBuffer& b) { ArrayPtr(b.TransferArray(size, false)); },
-    };
+        [&](OutputBuffer& b) { ArrayPtr(b.TransferArray(size, false)); }};
     const std::size_t blocks = embedded::liveBlockCount();
+    const auto failsAt = [&](const auto& operation, std::size_t appends, std::size_t nth) {
+        OutputBuffer buffer(vxUINT16_CLASS, 8, 8, 8);
+        for (std::size_t i = 0; i < appends; ++i)
+            buffer.AppendData(vxUINT16_CLASS, many.data() + i, i % 2 == 0 ? 5 : 100);
+        const Units before = contents(buffer);
+        const std::size_t capacity = buffer.GetCurrentCapacity();
+        const embedded::FailingAllocation failure(nth);
+        const std::string raised = fileio_tests::raisedBy([&] { operation(buffer); });
+        EXPECT_EQ(raised, failure.happened() ? "KESTRA:nomem" : "");
+        EXPECT_TRUE(raised.empty() || contents(buffer) == before);
+        EXPECT_TRUE(raised.empty() || buffer.GetCurrentCapacity() == capacity);
+        return failure.happened();
+    };
     for (const auto& operation : operations) {
-        for (const std::size_t chunks : {0u, 1u, 4u}) {
-            bool failed = true;
-            for (std::size_t nth = 1; failed; ++nth) {
-                OutputBuffer buffer(vxUINT16_CLASS, 8, 8, 8);
-                for (std::size_t i = 0; i < chunks; ++i)
-                    buffer.AppendData(vxUINT16_CLASS, many.data() + i, i % 2 == 0 ? 5 : 100);
-                const Units before = contents(buffer);
-                const std::size_t capacity = buffer.GetCurrentCapacity();
-                const embedded::FailingAllocation failure(nth);
-                try {
-                    operation(buffer);
-                } catch (const embedded::OutOfMemoryError&) {
-                    EXPECT_EQ(contents(buffer), before);
-                    EXPECT_EQ(buffer.GetCurrentCapacity(), capacity);
-                }
-                failed = failure.happened();
+        for (const std::size_t appends : {0u, 1u, 4u})
+            for (std::size_t nth = 1; failsAt(operation, appends, nth); ++nth) {
             }
-        }
     }
     EXPECT_EQ(embedded::liveBlockCount(), blocks);
-}
-
-TEST(OutputBuffer, RefusesSizesBeyondTheAddressSpace) {
-    OutputBuffer buffer(vxDOUBLE_CLASS, 1, 1, 1);
-    std::size_t asked = 4;
-    buffer.Allocate(asked);
-    for (std::size_t n : {SIZE_MAX, SIZE_MAX / 8 + 1}) {
-        EXPECT_EQ(fileio_tests::raisedBy([&] { buffer.Allocate(n); }),
-                  "KESTRA:legacy_two_part:p64bitsize");
-        EXPECT_EQ(buffer.GetSize(), 4u);
-    }
-    buffer.SetLastChunkSize(3);
-    EXPECT_EQ(buffer.GetSize(), 3u);
 }
 
 }  // namespace
