@@ -17,8 +17,12 @@ void begin(OpenFile& file, Direction direction, int isBitTransfer, int dataSizeT
     }
     if (isBitTransfer != 0) file.carry().active = true;
     const Direction before = std::exchange(file.direction, direction);
-    if (before == Direction::None || before == direction || file.stream->isScreen()) return;
-    if (fseeko(file.handle.get(), 0, SEEK_CUR) != 0) {
+    // Bits that are appended are merged with what stands at the end, not where the file was opened.
+    const bool mergesAtEnd =
+        isBitTransfer != 0 && !isRead && file.permission.append && file.permission.update;
+    const bool turns = before != Direction::None && before != direction;
+    if (file.stream->isScreen() || !(turns || mergesAtEnd)) return;
+    if (fseeko(file.handle.get(), 0, mergesAtEnd ? SEEK_END : SEEK_CUR) != 0) {
         throw CodeError(file.failure(code::FseekFailed));
     }
 }
