@@ -1,8 +1,9 @@
 #include "fileio/attributes/file_permission.h"
 
-#include "fileio/host/exception.h"
+#include "tests/support/raised.h"
 
 #include <string>
+#include <utility>
 
 #include <gtest/gtest.h>
 
@@ -10,103 +11,55 @@ namespace {
 
 using Orvandeil::FileIO::FilePermission;
 
-std::string validationError(const FilePermission& permission) {
-    try {
-        permission.Validate();
-    } catch (const foundation::core::except::IMsgIDException& error) {
-        return error.GetID();
-    }
-    return "";
+// The text kept, the flags as the letters that set them ("rwa+bt", 'f' for automatic flushing), the
+// mode for fopen, and the last part of the error.
+std::string summary(const FilePermission& p) {
+    std::string all = p.text + ':';
+    const std::pair<bool, char> flags[] = {{p.read, 'r'},     {p.write, 'w'},  {p.append, 'a'},
+                                           {p.update, '+'},   {p.binary, 'b'}, {p.textMode, 't'},
+                                           {p.autoFlush, 'f'}};
+    for (const auto& [isSet, letter] : flags)
+        all += isSet ? std::string(1, letter) : "";
+    const std::string error = fileio_tests::raisedBy([&] { p.Validate(); });
+    EXPECT_EQ(fileio_tests::raisedBy([&] { p.Validate(); }), error) << "the second time";
+    EXPECT_EQ(p.valid, error.empty());
+    return all + ' ' + p.fileSystemFormat + (p.valid ? "" : error.substr(error.rfind(':')));
 }
 
-// The flags as the letters that set them, in field order: "rwa+bt", 'f' for automatic flushing.
-std::string flags(const FilePermission& p) {
-    std::string letters;
-    if (p.read) letters += 'r';
-    if (p.write) letters += 'w';
-    if (p.append) letters += 'a';
-    if (p.update) letters += '+';
-    if (p.binary) letters += 'b';
-    if (p.textMode) letters += 't';
-    if (p.autoFlush) letters += 'f';
-    return letters;
+std::string summaryOf(const char* mode) {
+    FilePermission permission("a+", true);
+    permission = mode;
+    const FilePermission copy = permission;
+    EXPECT_TRUE(copy.constructionFlag);
+    EXPECT_EQ(summary(copy), summary(permission));
+    return summary(copy);
 }
 
-constexpr char badPermission[] = "KESTRA:legacy_two_part:badpermission_vx";
-constexpr char incorrect[] = "KESTRA:fopen:IncorrectFileMode";
-constexpr char conflicting[] = "KESTRA:fopen:ConflictingExclusiveFileModes";
-
-TEST(FilePermission, AcceptsModes) {
-    const struct {
-        int line;
-        const char* mode;
-        const char* kept;
-        const char* fopenMode;
-        const char* flags;
-    } rows[] = {
-        {__LINE__, "r", "r", "rb", "rf"},        {__LINE__, "rb", "rb", "rb", "rbf"},
-        {__LINE__, "rt", "r", "rb", "rtf"},      {__LINE__, "rbt", "rb", "rb", "rbtf"},
-        {__LINE__, "rtt", "rt", "rb", "rtf"},  // one 't' is dropped, not all
-        {__LINE__, "w", "w", "wb", "wf"},        {__LINE__, "A", "A", "ab", "a"},
-        {__LINE__, "r+b", "r+b", "r+b", "r+bf"}, {__LINE__, "W", "W", "wb", "w"},
-        {__LINE__, "w+t", "w+", "w+b", "w+tf"},  {__LINE__, "a+", "a+", "a+b", "a+f"},
-        {__LINE__, "W+", "W+", "w+b", "w+"},     {__LINE__, "rr", "rr", "rb", "rf"},
-        {__LINE__, "aA", "aA", "ab", "a"},  // the large letter decides, wherever it stands
-    };
-    for (const auto& row : rows) {
-        const FilePermission permission(row.mode, true);
-        EXPECT_TRUE(permission.valid) << row.line;
-        EXPECT_EQ(permission.text, row.kept) << row.line;
-        EXPECT_STREQ(permission.fileSystemFormat, row.fopenMode) << row.line;
-        EXPECT_EQ(flags(permission), row.flags) << row.line;
-        EXPECT_TRUE(permission.constructionFlag) << row.line;
-        EXPECT_EQ(validationError(permission), "") << row.line;
-    }
+TEST(FilePermission, TakesModes) {
+    const char* const modes[] = {"r:rf rb",      "rb:rbf rb",  "w:wf wb",   "A:a ab",   "W:w wb",
+                                 "r+b:r+bf r+b", "a+:a+f a+b", "W+:w+ w+b", "rr:rf rb", "aA:a ab"};
+    for (const std::string row : modes)
+        EXPECT_EQ(summaryOf(row.substr(0, row.find(':')).c_str()), row);
+    // One 't' is dropped, not all.
+    EXPECT_EQ(summaryOf("rt"), "r:rtf rb");
+    EXPECT_EQ(summaryOf("rtt"), "rt:rtf rb");
+    EXPECT_EQ(summaryOf("w+t"), "w+:w+tf w+b");
+    EXPECT_EQ(summary(FilePermission()), "r:rf rb");
 }
 
 TEST(FilePermission, KeepsErrorsUntilValidated) {
-    const struct {
-        int line;
-        const char* mode;
-        const char* identifier;
-        const char* flags;  // before: "a+"
-    } rows[] = {
-        {__LINE__, "", badPermission, "a+f"},
-        {__LINE__, "+r", badPermission, "a+f"},
-        {__LINE__, "t", badPermission, "a+f"},
-        {__LINE__, "xr", badPermission, "a+f"},
-        {__LINE__, "rx", incorrect, "a+f"},
-        {__LINE__, "rwx", incorrect, "a+f"},  // foreign letters before conflicts
-        {__LINE__, "r ", incorrect, "a+f"},
-        {__LINE__, "rt,ccs=UTF-8", incorrect, "a+f"},
-        {__LINE__, "rw", conflicting, "rwf"},
-        {__LINE__, "aW", conflicting, "wa"},
-    };
-    for (const auto& row : rows) {
-        FilePermission permission("a+", false);
-        permission = row.mode;
-        EXPECT_FALSE(permission.valid) << row.line;
-        EXPECT_EQ(permission.text, row.mode) << row.line;
-        EXPECT_EQ(flags(permission), row.flags) << row.line;
-        EXPECT_STREQ(permission.fileSystemFormat, "a+b") << row.line;
-        const FilePermission copy = permission;
-        EXPECT_EQ(validationError(permission), row.identifier) << row.line;
-        EXPECT_EQ(validationError(permission), row.identifier) << row.line << ": second time";
-        EXPECT_EQ(validationError(copy), row.identifier) << row.line << ": copy";
-    }
-}
+    for (const std::string mode : {"", "+r", "t", "xr"})
+        EXPECT_EQ(summaryOf(mode.c_str()), mode + ":a+f a+b:badpermission_vx");
+    for (const std::string mode : {"rx", "rwx", "r ", "rt,ccs=UTF-8"})
+        EXPECT_EQ(summaryOf(mode.c_str()), mode + ":a+f a+b:IncorrectFileMode");
+    EXPECT_EQ(summaryOf("rw"), "rw:rwf a+b:ConflictingExclusiveFileModes");
+    EXPECT_EQ(summaryOf("aW"), "aW:wa a+b:ConflictingExclusiveFileModes");
 
-TEST(FilePermission, StartsForReadingAndForgetsOldErrors) {
-    FilePermission permission;
-    EXPECT_EQ(flags(permission) + permission.text + permission.fileSystemFormat, "rfrrb");
-    EXPECT_FALSE(permission.constructionFlag);
-
-    permission = "rw";
+    FilePermission permission("rw", false);
     permission = "w";
-    EXPECT_EQ(validationError(permission), "");
-
-    permission.valid = false;  // invalid without a stored error: the general one
-    EXPECT_EQ(validationError(permission), badPermission);
+    EXPECT_EQ(summary(permission), "w:wf wb") << "the old error is forgotten";
+    permission.valid = false;
+    EXPECT_EQ(summary(permission), "w:wf wb:badpermission_vx");
 }
 
 }  // namespace

@@ -1,9 +1,7 @@
 #include "fileio/attributes/machine_format.h"
 
 #include "fileio/host/data_sizes.h"
-#include "fileio/host/exception.h"
-
-#include <string>
+#include "tests/support/raised.h"
 
 #include <gtest/gtest.h>
 
@@ -15,57 +13,33 @@ TEST(MachineFormat, ResolvesNames) {
     const int native = vxDataSizeNative();
     const int none = vxDataSizeCount() - 1;
     constexpr int before = 3;
-    const struct {
-        int line;
-        std::string name;
-        int index;
-        bool valid = true;
-    } rows[] = {
-        {__LINE__, "n", native},
-        {__LINE__, "NaTiVe", native},
-        {__LINE__, "L", 0},
-        {__LINE__, "b", 1},
-        {__LINE__, "a", 5},
-        {__LINE__, "S", 6},
-        {__LINE__, vxDataSizeName(6), 6},
-        {__LINE__, "LITTLE-endian", 0},
-        {__LINE__, "", none, false},
-        {__LINE__, "x", none, false},
-        {__LINE__, "\t", none, false},
-        {__LINE__, " ", before, false},    // refused, and nothing changes
-        {__LINE__, "  ", none, false},     // no match for formats without a name
-        {__LINE__, "nativ", none, false},  // no abbreviations
-        {__LINE__, "\xCC", none, false},   // no letter, though 'L' with a bit added
-    };
-    for (const auto& row : rows) {
+    const auto indexOf = [&](const char* name) {
         MachineFormat format;
         format.dataSizeType = before;
-        format = row.name.c_str();
-        EXPECT_EQ(format.valid, row.valid) << row.line;
-        EXPECT_EQ(format.dataSizeType, row.index) << row.line;
-        EXPECT_EQ(format.text, "") << row.line;
-        if (row.index != before) {
-            EXPECT_EQ(MachineFormat(row.name.c_str()).dataSizeType, row.index) << row.line;
-        }
-    }
+        format = name;
+        EXPECT_EQ(format.valid, format.dataSizeType != none && format.dataSizeType != before);
+        EXPECT_EQ(format.text, "");
+        return format.dataSizeType;
+    };
+    EXPECT_EQ(indexOf("N"), native);
+    EXPECT_EQ(indexOf("NaTiVe"), native);
+    EXPECT_EQ(indexOf("L"), 0);
+    EXPECT_EQ(indexOf("a"), 5);
+    EXPECT_EQ(indexOf(vxDataSizeName(6)), 6);
+    EXPECT_EQ(indexOf("LITTLE-endian"), 0);
+    EXPECT_EQ(indexOf(" "), before) << "refused, and nothing changes";
+    for (const char* name : {"", "x", "\t", "  ", "nativ", "\xCC"})
+        EXPECT_EQ(indexOf(name), none) << name;
 }
 
 TEST(MachineFormat, ValidatesByLegacyNumber) {
-    MachineFormat format;
-    EXPECT_EQ(format.dataSizeType, vxDataSizeNative());
-    EXPECT_EQ(format.errorMessageNumber, 34);
-    EXPECT_NO_THROW(format.Validate());
-
-    format = "no such format";
-    const MachineFormat copy = format;
+    const MachineFormat native, invalid("no such format"), copy = invalid;
+    EXPECT_EQ(native.dataSizeType, vxDataSizeNative());
+    EXPECT_EQ(native.errorMessageNumber, 34);
     EXPECT_EQ(copy.dataSizeType, vxDataSizeCount() - 1);
-    EXPECT_FALSE(copy.valid);
-    try {
-        copy.Validate();
-        ADD_FAILURE() << "an invalid format passed";
-    } catch (const foundation::core::except::IMsgIDException& error) {
-        EXPECT_EQ(error.GetID(), "KESTRA:legacy_two_part:badmachformat_vx");
-    }
+    EXPECT_EQ(fileio_tests::raisedBy([&] { native.Validate(); }), "");
+    EXPECT_EQ(fileio_tests::raisedBy([&] { copy.Validate(); }),
+              "KESTRA:legacy_two_part:badmachformat_vx");
 }
 
 }  // namespace

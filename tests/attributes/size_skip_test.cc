@@ -18,91 +18,71 @@ using embedded::makeRow;
 
 constexpr double inf = HUGE_VAL;
 constexpr double limit = 281474976710655;
-const char* const badSize = "KESTRA:legacy_two_part:badsize_vx";
-const char* const badSkip = "KESTRA:legacy_two_part:badskip_vx";
-const char* const notNumeric = "KESTRA:FileIO:sizeMustBeNumeric";
 
-std::string raisedBy(const NumericAttr& attribute) {
-    return fileio_tests::raisedBy([&] { attribute.Validate(); });
+// The last part of what an attribute raises.
+std::string errorOf(const NumericAttr& attribute) {
+    const std::string raised = fileio_tests::raisedBy([&] { attribute.Validate(); });
+    EXPECT_EQ(fileio_tests::raisedBy([&] { attribute.Validate(); }), raised) << "the second time";
+    EXPECT_EQ(attribute.IsValid(), raised.empty());
+    return raised.substr(raised.rfind(':') + 1);
+}
+
+// "m n", what it is besides, the error.
+std::string summary(const SizeAttribute& size) {
+    return std::to_string(size.m) + ' ' + std::to_string(size.n) +
+           (size.isMatrix ? " matrix" : "") + (size.isInfinite ? " infinite" : "") + ' ' +
+           errorOf(size);
+}
+
+std::string sizeOf(const std::vector<double>& values) {
+    return summary(SizeAttribute(makeDoubles(1, values.size(), values).get()));
 }
 
 TEST(SizeAttribute, ParsesNumbersAndPairs) {
-    const struct {
-        int line;
-        std::vector<double> values;  // one row
-        bool valid;
-        unsigned long m, n;
-        bool isInfinite;
-    } rows[] = {
-        {__LINE__, {2.9}, true, 2, 1, false},
-        {__LINE__, {0}, true, 0, 0, false},
-        {__LINE__, {0.5}, true, 0, 1, false},
-        {__LINE__, {limit}, true, 281474976710655, 1, false},
-        {__LINE__, {limit + 1}, true, 1, 0, true},
-        {__LINE__, {1e300}, true, 1, 0, true},
-        {__LINE__, {-1}, false, 1, 0, false},
-        {__LINE__, {-0.5}, false, 1, 0, false},
-        {__LINE__, {NAN}, false, 1, 0, false},
-        {__LINE__, {}, false, 1, 0, false},
-        {__LINE__, {3, 4.9}, true, 3, 4, false},
-        {__LINE__, {3, inf}, true, 3, 0, true},
-        {__LINE__, {0, inf}, true, 0, 0, false},
-        {__LINE__, {0.5, inf}, true, 0, 0, true},
-        {__LINE__, {16777216, 16777215}, true, 16777216, 16777215, false},
-        {__LINE__, {16777216, 16777216}, false, 1, 0, false},
-        {__LINE__, {inf, 3}, false, 1, 0, false},
-        {__LINE__, {limit + 1, 0}, false, 1, 0, false},
-        {__LINE__, {0, NAN}, false, 1, 0, false},
-        {__LINE__, {NAN, 1}, false, 1, 0, false},
-        {__LINE__, {1, -0.1}, false, 1, 0, false},
-        {__LINE__, {1, 2, 3}, false, 1, 0, false},
-    };
-    for (const auto& row : rows) {
-        const SizeAttribute size(makeDoubles(1, row.values.size(), row.values).get());
-        EXPECT_EQ(size.IsValid(), row.valid) << row.line;
-        EXPECT_EQ(raisedBy(size), row.valid ? "" : badSize) << row.line;
-        EXPECT_EQ(size.m, row.m) << row.line;
-        EXPECT_EQ(size.n, row.n) << row.line;
-        EXPECT_EQ(size.isInfinite, row.isInfinite) << row.line;
-        EXPECT_EQ(size.isMatrix, row.valid && row.values.size() == 2) << row.line;
-    }
+    EXPECT_EQ(sizeOf({2.9}), "2 1 ");
+    EXPECT_EQ(sizeOf({0}), "0 0 ");
+    EXPECT_EQ(sizeOf({0.5}), "0 1 ");
+    EXPECT_EQ(sizeOf({limit}), "281474976710655 1 ");
+    EXPECT_EQ(sizeOf({limit + 1}), "1 0 infinite ");
+    EXPECT_EQ(sizeOf({3, 4.9}), "3 4 matrix ");
+    EXPECT_EQ(sizeOf({3, inf}), "3 0 matrix infinite ");
+    EXPECT_EQ(sizeOf({0, inf}), "0 0 matrix ");
+    EXPECT_EQ(sizeOf({0.5, inf}), "0 0 matrix infinite ");
+    EXPECT_EQ(sizeOf({16777216, 16777215}), "16777216 16777215 matrix ");
+    for (const std::vector<double>& values : std::vector<std::vector<double>>{{-0.5},
+                                                                              {NAN},
+                                                                              {},
+                                                                              {16777216, 16777216},
+                                                                              {limit + 1, 0},
+                                                                              {0, NAN},
+                                                                              {NAN, 1},
+                                                                              {1, -0.1},
+                                                                              {1, 2, 3}})
+        EXPECT_EQ(sizeOf(values), "1 0 badsize_vx") << testing::PrintToString(values);
 }
 
 TEST(SizeAttribute, LooksAtTheTypeBeforeTheShape) {
-    const struct {
-        int line;
-        ArrayPtr array;
-        const char* raised;
-    } rows[] = {
-        {__LINE__, embedded::makeChars(u"7"), notNumeric},
-        {__LINE__, embedded::makeChars(u""), notNumeric},
-        {__LINE__, embedded::makeNumeric(vxLOGICAL_CLASS, {1, 1}), notNumeric},
-        {__LINE__, embedded::makeNumeric(vxDOUBLE_CLASS, {1, 1}, vxCOMPLEX), notNumeric},
-        {__LINE__, embedded::makeString(u"7"), notNumeric},
-        {__LINE__, embedded::makeNumeric(vxDOUBLE_CLASS, {1, 1, 2}), badSize},
-        {__LINE__, embedded::makeNumeric(vxINT8_CLASS, {2, 1}), badSize},
-        {__LINE__, makeRow<std::int8_t>(vxINT8_CLASS, {-1}), badSize},
-        {__LINE__, makeRow<std::uint64_t>(vxUINT64_CLASS, {7, 8}), ""},
-        {__LINE__, makeRow<float>(vxSINGLE_CLASS, {7, HUGE_VALF}), ""},
-    };
-    for (const auto& row : rows)
-        EXPECT_EQ(raisedBy(SizeAttribute(row.array.get())), row.raised) << row.line;
+    const auto error = [](const ArrayPtr& array) { return errorOf(SizeAttribute(array.get())); };
+    EXPECT_EQ(error(embedded::makeChars(u"")), "sizeMustBeNumeric");
+    EXPECT_EQ(error(embedded::makeNumeric(vxLOGICAL_CLASS, {1, 1})), "sizeMustBeNumeric");
+    EXPECT_EQ(error(embedded::makeNumeric(vxDOUBLE_CLASS, {1, 1}, vxCOMPLEX)), "sizeMustBeNumeric");
+    EXPECT_EQ(error(embedded::makeString(u"7")), "sizeMustBeNumeric");
+    EXPECT_EQ(error(embedded::makeNumeric(vxDOUBLE_CLASS, {1, 1, 2})), "badsize_vx");
+    EXPECT_EQ(error(embedded::makeNumeric(vxINT8_CLASS, {2, 1})), "badsize_vx");
+    EXPECT_EQ(error(makeRow<std::int8_t>(vxINT8_CLASS, {-1})), "badsize_vx");
+    EXPECT_EQ(error(makeRow<std::uint64_t>(vxUINT64_CLASS, {7, 8})), "");
 }
 
 TEST(SizeAttribute, StartsAfreshEachTime) {
     SizeAttribute size;
-    EXPECT_TRUE(size.IsValid() && size.isInfinite && !size.isMatrix);
+    EXPECT_EQ(summary(size), "1 0 infinite ");
     size = embedded::makeChars(u"7").get();
     const SizeAttribute copy = size;
-    EXPECT_EQ(raisedBy(size), notNumeric);
-    EXPECT_EQ(raisedBy(size), notNumeric);
     size = makeDoubles(1, 2, {3, inf}).get();
-    EXPECT_EQ(raisedBy(size), "");
+    EXPECT_EQ(summary(size), "3 0 matrix infinite ");
     size = makeDoubles(1, 1, {NAN}).get();
-    EXPECT_EQ(raisedBy(size), badSize);
-    EXPECT_EQ(size.m, 1u);
-    EXPECT_FALSE(size.isMatrix);
-    EXPECT_EQ(raisedBy(copy), notNumeric);
+    EXPECT_EQ(summary(size), "1 0 badsize_vx");
+    EXPECT_EQ(errorOf(copy), "sizeMustBeNumeric");
 
     int form = 9;
     EXPECT_EQ(size.ParseSize(makeDoubles(1, 2, {5, 6}).get(), &form), 0);
@@ -113,102 +93,68 @@ TEST(SizeAttribute, StartsAfreshEachTime) {
 }
 
 TEST(SizeAttribute, AdjustsToBytesInOneRow) {
-    const struct {
-        int line;
-        int kind;
-        unsigned long m, n;
-        bool isInfinite;
-        unsigned long elementSize, newM, newN;
-        bool raises;
-    } rows[] = {
-        {__LINE__, 13, 3, 5, false, 4, 1, 4, false},
-        {__LINE__, 12, 3, 5, false, 4, 3, 5, false},
-        {__LINE__, 13, 3, 5, true, 0, 1, 5, false},
-        {__LINE__, 13, 0, 5, false, 8, 1, 0, false},
-        {__LINE__, 13, 0, 5, false, 0, 0, 5, true},
-        {__LINE__, 13, 3, 5, false, 0, 3, 5, true},
-        {__LINE__, 13, 1ul << 32, 1ul << 31, false, 1, 1, 1ul << 63, false},
-        {__LINE__, 13, 1ul << 32, 1ul << 32, false, 1, 1ul << 32, 1ul << 32, true},
-    };
-    for (const auto& row : rows) {
+    using Count = unsigned long;
+    const auto adjusted = [](int kind, Count m, Count n, bool isInfinite, Count elementSize) {
         SizeAttribute size;
-        size.m = row.m;
-        size.n = row.n;
-        size.isInfinite = row.isInfinite;
-        EXPECT_EQ(fileio_tests::raisedBy([&] { size.Adjust(row.kind, row.elementSize); }),
-                  row.raises ? "KESTRA:legacy_two_part:p64bitsize" : "")
-            << row.line;
-        EXPECT_EQ(size.m, row.newM) << row.line;
-        EXPECT_EQ(size.n, row.newN) << row.line;
-    }
+        size.m = m;
+        size.n = n;
+        size.isInfinite = isInfinite;
+        const auto raised = fileio_tests::raisedBy([&] { size.Adjust(kind, elementSize); });
+        return std::to_string(size.m) + ' ' + std::to_string(size.n) + raised;
+    };
+    const std::string tooBig = "KESTRA:legacy_two_part:p64bitsize";
+    EXPECT_EQ(adjusted(13, 3, 5, false, 4), "1 4");
+    EXPECT_EQ(adjusted(12, 3, 5, false, 4), "3 5");
+    EXPECT_EQ(adjusted(13, 3, 5, true, 0), "1 5");
+    EXPECT_EQ(adjusted(13, 0, 5, false, 8), "1 0");
+    EXPECT_EQ(adjusted(13, 0, 5, false, 0), "0 5" + tooBig);
+    EXPECT_EQ(adjusted(13, 3, 5, false, 0), "3 5" + tooBig);
+    EXPECT_EQ(adjusted(13, 1ul << 32, 1ul << 31, false, 1), "1 9223372036854775808");
+    EXPECT_EQ(adjusted(13, 1ul << 32, 1ul << 32, false, 1), "4294967296 4294967296" + tooBig);
 }
 
 TEST(SkipAttribute, TakesTheFirstElement) {
-    const struct {
-        int line;
-        ArrayPtr array;
-        bool valid;
-        long skip;
-    } rows[] = {
-        {__LINE__, embedded::makeScalar(3), true, 3},
-        {__LINE__, makeDoubles(2, 1, {2, 9}), true, 2},
-        {__LINE__, makeRow<std::int8_t>(vxINT8_CLASS, {5}), true, 5},
-        {__LINE__, makeRow<std::uint64_t>(vxUINT64_CLASS, {LONG_MAX}), true, LONG_MAX},
-        {__LINE__, makeRow<std::uint64_t>(vxUINT64_CLASS, {1ul << 63}), false, LONG_MAX},
-        {__LINE__, embedded::makeScalar(3.5), false, 3},
-        {__LINE__, embedded::makeScalar(-1), false, -1},
-        {__LINE__, embedded::makeScalar(NAN), false, 0},
-        {__LINE__, embedded::makeScalar(inf), false, 1},
-        {__LINE__, makeDoubles(0, 0, {}), false, 0},
-        {__LINE__, embedded::makeChars(u"3"), false, 0},
-        {__LINE__, embedded::makeNumeric(vxLOGICAL_CLASS, {1, 1}), false, 0},
-    };
     SkipAttribute reused;
-    for (const auto& row : rows) {
-        reused = row.array.get();
-        EXPECT_EQ(raisedBy(reused), row.valid ? "" : badSkip) << row.line;
-        EXPECT_EQ(reused.skip, row.skip) << row.line;
-    }
+    const auto skip = [&](const ArrayPtr& array) {
+        reused = array.get();
+        return std::to_string(reused.skip) + errorOf(reused);
+    };
+    const std::string bad = "badskip_vx";
+    EXPECT_EQ(skip(makeDoubles(2, 1, {2, 9})), "2");
+    EXPECT_EQ(skip(makeDoubles(1, 1, {3.5})), "3" + bad);
+    EXPECT_EQ(skip(makeRow<std::int8_t>(vxINT8_CLASS, {5})), "5");
+    EXPECT_EQ(skip(makeRow<std::uint64_t>(vxUINT64_CLASS, {LONG_MAX})), std::to_string(LONG_MAX));
+    EXPECT_EQ(skip(makeRow<std::uint64_t>(vxUINT64_CLASS, {1ul << 63})),
+              std::to_string(LONG_MAX) + bad);
+    EXPECT_EQ(skip(embedded::makeScalar(-1)), "-1" + bad);
+    EXPECT_EQ(skip(embedded::makeScalar(inf)), "1" + bad);
+    EXPECT_EQ(skip(makeDoubles(0, 0, {})), "0" + bad);
+    EXPECT_EQ(skip(embedded::makeChars(u"3")), "0" + bad);
+    EXPECT_EQ(skip(embedded::makeNumeric(vxLOGICAL_CLASS, {1, 1})), "0" + bad);
 }
 
 TEST(NumericAttr, ReadsWholeNumbersOf64Bits) {
-    const struct {
-        int line;
-        double d;
-        bool whole;
-        long out;
-    } rows[] = {
-        {__LINE__, 0, true, 0},
-        {__LINE__, -2.5, false, -2},
-        {__LINE__, 0x1p62, true, 1l << 62},
-        {__LINE__, 0x1p63, false, 0},
-        {__LINE__, 0x1p63 - 1024, true, LONG_MAX - 1023},
-        {__LINE__, -0x1p63, true, LONG_MIN},
-        {__LINE__, -0x1p63 - 2048, false, 0},
-        {__LINE__, inf, false, 1},
-        {__LINE__, -inf, false, -1},
-        {__LINE__, NAN, false, 0},
-    };
-    for (const auto& row : rows) {
+    const auto whole = [](double d) {
         long out = 77;
-        bool isNaN = !std::isnan(row.d);
-        bool isInf = !std::isinf(row.d);
-        EXPECT_EQ(NumericAttr::GetInt64(row.d, out, &isNaN, &isInf), row.whole) << row.line;
-        EXPECT_EQ(out, row.out) << row.line;
-        EXPECT_EQ(isNaN, std::isnan(row.d)) << row.line;
-        EXPECT_EQ(isInf, std::isinf(row.d)) << row.line;
-    }
-}
-
-TEST(NumericAttr, ReplacesWhatIsNo32BitNumber) {
-    const struct {
-        double d;
-        int result;
-    } rows[] = {{3e9, 7},   {-3e9, INT_MIN}, {NAN, 7},        {2147483647, INT_MAX},
-                {-2.9, -2}, {inf, 7},        {-inf, INT_MIN}, {2147483647.5, 7},
-                {2.9, 2}};
-    for (const auto& row : rows)
-        EXPECT_EQ(NumericAttr::ReplaceOutOfRange(row.d, 7), row.result) << row.d;
+        bool isNaN = !std::isnan(d), isInf = !std::isinf(d);
+        const bool isWhole = NumericAttr::GetInt64(d, out, &isNaN, &isInf);
+        EXPECT_TRUE(isNaN == std::isnan(d) && isInf == std::isinf(d)) << d;
+        return std::to_string(out) + (isWhole ? "" : " no");
+    };
+    EXPECT_EQ(whole(0), "0");
+    EXPECT_EQ(whole(-2.5), "-2 no");
+    EXPECT_EQ(whole(0x1p63), "0 no");
+    EXPECT_EQ(whole(0x1p63 - 1024), std::to_string(LONG_MAX - 1023));
+    EXPECT_EQ(whole(-0x1p63), std::to_string(LONG_MIN));
+    EXPECT_EQ(whole(-0x1p63 - 2048), "0 no");
+    EXPECT_EQ(whole(inf), "1 no");
+    EXPECT_EQ(whole(-inf), "-1 no");
+    EXPECT_EQ(whole(NAN), "0 no");
+    const std::pair<double, int> rows[] = {
+        {3e9, 7},   {-3e9, INT_MIN}, {NAN, 7},         {0x1p31 - 1, INT_MAX},
+        {-2.9, -2}, {-inf, INT_MIN}, {0x1p31 - 0.5, 7}};
+    for (const auto& [d, result] : rows)
+        EXPECT_EQ(NumericAttr::ReplaceOutOfRange(d, 7), result) << d;
 }
 
 }  // namespace
