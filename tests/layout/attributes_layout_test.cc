@@ -5,37 +5,17 @@
 
 namespace Orvandeil::FileIO {
 
-template <>
-std::vector<layout::Field> LayoutProbe::fields<FilePermission>() {
-    return {FIELD(FilePermission, text),         FIELD(FilePermission, valid),
-            FIELD(FilePermission, read),         FIELD(FilePermission, write),
-            FIELD(FilePermission, append),       FIELD(FilePermission, update),
-            FIELD(FilePermission, binary),       FIELD(FilePermission, textMode),
-            FIELD(FilePermission, autoFlush),    FIELD(FilePermission, constructionFlag),
-            FIELD(FilePermission, pendingError), FIELD(FilePermission, fileSystemFormat)};
-}
-
-namespace {
-
-template <class Attribute>
-void expectTextAttribute() {
-    layout::expectPlaces({SLOT(2, Attribute, Validate), SLOT(3, Attribute, Init)});
-}
+PRIVATE_FIELDS(FilePermission, text, valid, read, write, append, update, binary, textMode,
+               autoFlush, constructionFlag, pendingError, fileSystemFormat)
 
 TEST(Layout, TextAttributes) {
-    expectTextAttribute<FilePermission>();
-    expectTextAttribute<MachineFormat>();
-    expectTextAttribute<PrecisionString>();
+    layout::expectSlots(2, SLOTS(FilePermission, Validate, Init));
+    layout::expectSlots(2, SLOTS(MachineFormat, Validate, Init));
+    layout::expectSlots(2, SLOTS(PrecisionString, Validate, Init));
     layout::expectOrder(LayoutProbe::fields<FilePermission>());
-    layout::expectOrder({FIELD(MachineFormat, text), FIELD(MachineFormat, valid),
-                         FIELD(MachineFormat, errorMessageNumber),
-                         FIELD(MachineFormat, dataSizeType)});
-    layout::expectOrder({FIELD(PrecisionString, text), FIELD(PrecisionString, valid),
-                         FIELD(PrecisionString, outputType), FIELD(PrecisionString, machineFormat),
-                         FIELD(PrecisionString, repeatCount), FIELD(PrecisionString, convertedSize),
-                         FIELD(PrecisionString, inputType), FIELD(PrecisionString, bitCount),
-                         FIELD(PrecisionString, allowConversion)});
+    layout::expectOrder(FIELDS(MachineFormat, text, valid, errorMessageNumber, dataSizeType));
+    layout::expectOrder(FIELDS(PrecisionString, text, valid, outputType, machineFormat, repeatCount,
+                               convertedSize, inputType, bitCount, allowConversion));
 }
 
-}  // namespace
 }  // namespace Orvandeil::FileIO

@@ -4,58 +4,29 @@
 
 namespace Orvandeil::FileIO {
 
-template <>
-std::vector<layout::Field> LayoutProbe::fields<fileStream>() {
-    return {FIELD(fileStream, file),         FIELD(fileStream, permission),
-            FIELD(fileStream, fileName),     FIELD(fileStream, bytesWritten),
-            FIELD(fileStream, lastByteRead), FIELD(fileStream, carryByte),
-            FIELD(fileStream, spareText)};
-}
-
-template <>
-std::vector<layout::Field> LayoutProbe::fields<CarryByte>() {
-    return {FIELD(CarryByte, active),      FIELD(CarryByte, carryValue),
-            FIELD(CarryByte, pendingBits), FIELD(CarryByte, lastWasWrite),
-            FIELD(CarryByte, bitOrder),    FIELD(CarryByte, stream)};
-}
-
-template <>
-std::vector<layout::Field> LayoutProbe::fields<outputScreenStream>() {
-    return {FIELD(outputScreenStream, bufferSize), FIELD(outputScreenStream, bytesWritten),
-            FIELD(outputScreenStream, console)};
-}
-
-template <>
-std::vector<layout::Field> LayoutProbe::fields<stdErrStream>() {
-    return {FIELD(stdErrStream, errorConsole)};
-}
-
-namespace {
+PRIVATE_FIELDS(fileStream, file, permission, fileName, bytesWritten, lastByteRead, carryByte,
+               spareText)
+PRIVATE_FIELDS(CarryByte, active, carryValue, pendingBits, lastWasWrite, bitOrder, stream)
+PRIVATE_FIELDS(outputScreenStream, bufferSize, bytesWritten, console)
+PRIVATE_FIELDS(stdErrStream, errorConsole)
 
 TEST(Layout, FileStreams) {
     bool (fileStream::*fileSize)(long&) = &fileStream::getFileSize;
     EXPECT_EQ(layout::slotOf(fileSize), 20);
-    layout::expectPlaces({SLOT(18, fileStream, GetLine), SLOT(19, fileStream, setPosition),
-                          SLOT(21, fileStream, isFileOpen), SLOT(22, fileStream, flush),
-                          SLOT(23, fileStream, isScreen), SLOT(24, fileStream, clearError),
-                          SLOT(25, fileStream, CheckStreamEncoding)});
+    layout::expectSlots(18, SLOTS(fileStream, GetLine, setPosition));
+    layout::expectSlots(
+        21, SLOTS(fileStream, isFileOpen, flush, isScreen, clearError, CheckStreamEncoding));
     layout::expectOrder(LayoutProbe::fields<fileStream>());
-}
-
-TEST(Layout, CarryBytes) {
-    const std::vector<layout::Field> fields = LayoutProbe::fields<CarryByte>();
-    EXPECT_EQ(fields.front().offset, sizeof(void*));
-    layout::expectOrder(fields);
+    layout::expectOrder(LayoutProbe::fields<CarryByte>(), sizeof(void*));
 }
 
 TEST(Layout, ConsoleStreams) {
-    layout::expectPlaces({SLOT(26, screenStreamBase, getByte),  //
-                          SLOT(27, outputScreenStream, printCommon)});
+    layout::expectSlots(26, SLOTS(screenStreamBase, getByte));
+    layout::expectSlots(27, SLOTS(outputScreenStream, printCommon));
     EXPECT_EQ(sizeof(screenStreamBase), sizeof(fileStream));
-    std::vector<layout::Field> fields = LayoutProbe::fields<outputScreenStream>();
+    layout::Places fields = LayoutProbe::fields<outputScreenStream>();
     fields.push_back(LayoutProbe::fields<stdErrStream>().front());
     layout::expectOrder(fields);
 }
 
-}  // namespace
 }  // namespace Orvandeil::FileIO

@@ -6,65 +6,45 @@ namespace Orvandeil::FileIO {
 
 using IntegerPiece = finFormatPieceT<IntegerReadingFunctor<long long>, 14>;
 
-template <>
-std::vector<layout::Field> LayoutProbe::fields<finFormatPiece>() {
-    return {FIELD(finFormatPiece, width),      FIELD(finFormatPiece, savedWidth),
-            FIELD(finFormatPiece, text),       FIELD(finFormatPiece, asciiText),
-            FIELD(finFormatPiece, textLength), FIELD(finFormatPiece, suppress),
-            FIELD(finFormatPiece, oneChar)};
-}
-
-template <>
-std::vector<layout::Field> LayoutProbe::fields<finFormatParser>() {
-    return {FIELD(finFormatParser, input),       FIELD(finFormatParser, pieceStart),
-            FIELD(finFormatParser, cursor),      FIELD(finFormatParser, recycled),
-            FIELD(finFormatParser, pieces),      FIELD(finFormatParser, nextIndex),
-            FIELD(finFormatParser, resultClass), FIELD(finFormatParser, error)};
-}
-
-template <>
-std::vector<layout::Field> LayoutProbe::fields<scanControl>() {
-    return {FIELD(scanControl, limit),  FIELD(scanControl, unlimited),   FIELD(scanControl, piece),
-            FIELD(scanControl, count),  FIELD(scanControl, input),       FIELD(scanControl, parser),
-            FIELD(scanControl, buffer), FIELD(scanControl, conversions), FIELD(scanControl, error)};
-}
-
-// The first field of each kind of piece behind the common ones.
-template <>
-std::vector<layout::Field> LayoutProbe::fields<IntegerPiece>() {
-    return {FIELD(IntegerPiece, value), FIELD(finFormatPieceLiteral, source),
-            FIELD(finFormatPieceCMATCH, open), FIELD(finFormatPieceError, code)};
-}
+PRIVATE_FIELDS(finFormatPiece, width, savedWidth, text, asciiText, textLength, suppress, oneChar)
+PRIVATE_FIELDS(finFormatParser, input, pieceStart, cursor, recycled, pieces, nextIndex, resultClass,
+               error)
+PRIVATE_FIELDS(scanControl, limit, unlimited, piece, count, input, parser, buffer, conversions,
+               error)
+PRIVATE_FIELDS(IntegerPiece, value)
+PRIVATE_FIELDS(finFormatPieceLiteral, source)
+PRIVATE_FIELDS(finFormatPieceCMATCH, open)
+PRIVATE_FIELDS(finFormatPieceError, code)
 
 namespace {
 
 template <class Piece>
-std::vector<layout::Place> piecePlaces() {
-    return {SLOT(2, Piece, clone), SLOT(3, Piece, isLiteral), SLOT(4, Piece, getClassID),
-            SLOT(5, Piece, scan)};
+void expectPiece() {
+    layout::expectSlots(2, SLOTS(Piece, clone, isLiteral, getClassID, scan));
+}
+
+// The fields of each kind of piece stand behind the common ones.
+template <class Piece>
+void expectPieceWithFields() {
+    expectPiece<Piece>();
+    layout::Places fields = LayoutProbe::fields<finFormatPiece>();
+    fields.push_back(LayoutProbe::fields<Piece>().front());
+    layout::expectOrder(fields, sizeof(void*));
 }
 
 TEST(Layout, ScanPieces) {
-    layout::expectPlaces(piecePlaces<finFormatPiece>());
-    layout::expectPlaces(piecePlaces<IntegerPiece>());
-    layout::expectPlaces(piecePlaces<finFormatPieceS>());
-    layout::expectPlaces(piecePlaces<finFormatPieceC>());
-    layout::expectPlaces(piecePlaces<finFormatPieceCMATCH>());
-    layout::expectPlaces(piecePlaces<finFormatPieceLiteral>());
-    layout::expectPlaces(piecePlaces<finFormatPieceError>());
-
-    const std::vector<layout::Field> fields = LayoutProbe::fields<finFormatPiece>();
-    EXPECT_EQ(fields.front().offset, sizeof(void*));
-    layout::expectOrder(fields);
-    for (const layout::Field& own : LayoutProbe::fields<IntegerPiece>())
-        layout::expectOrder({fields.back(), own});
+    expectPiece<finFormatPiece>();
+    expectPiece<finFormatPieceS>();
+    expectPiece<finFormatPieceC>();
+    expectPieceWithFields<IntegerPiece>();
+    expectPieceWithFields<finFormatPieceCMATCH>();
+    expectPieceWithFields<finFormatPieceLiteral>();
+    expectPieceWithFields<finFormatPieceError>();
 }
 
 TEST(Layout, ScanDriver) {
-    layout::expectPlaces({SLOT(0, scanControl, pieceFlag)});
-    const std::vector<layout::Field> fields = LayoutProbe::fields<scanControl>();
-    EXPECT_EQ(fields.front().offset, sizeof(void*));
-    layout::expectOrder(fields);
+    layout::expectSlots(0, SLOTS(scanControl, pieceFlag));
+    layout::expectOrder(LayoutProbe::fields<scanControl>(), sizeof(void*));
     layout::expectOrder(LayoutProbe::fields<finFormatParser>());
 }
 

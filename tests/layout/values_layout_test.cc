@@ -1,4 +1,3 @@
-#include "fileio/attributes/numeric_attr.h"
 #include "fileio/attributes/size_attribute.h"
 #include "fileio/attributes/skip_attribute.h"
 #include "fileio/buffers/output_buffer.h"
@@ -6,43 +5,25 @@
 
 namespace Orvandeil::FileIO {
 
-template <>
-std::vector<layout::Field> LayoutProbe::fields<OutputBuffer>() {
-    return {FIELD(OutputBuffer, minChunk),
-            FIELD(OutputBuffer, maxChunk),
-            FIELD(OutputBuffer, currentCapacity),
-            FIELD(OutputBuffer, lastRequest),
-            FIELD(OutputBuffer, chunks),
-            FIELD(OutputBuffer, chunkCounts),
-            FIELD(OutputBuffer, elementsBeforeLast),
-            FIELD(OutputBuffer, classID),
-            FIELD(OutputBuffer, typeSize),
-            FIELD(OutputBuffer, rollbackStart),
-            FIELD(OutputBuffer, rollbackChunk),
-            FIELD(OutputBuffer, nextChunk),
-            FIELD(OutputBuffer, nextElement)};
-}
-
-namespace {
-
-struct OpenedAttr : NumericAttr {
-    using NumericAttr::error;
-    using NumericAttr::valid;
-};
+PRIVATE_FIELDS(OutputBuffer, minChunk, maxChunk, currentCapacity, lastRequest, chunks, chunkCounts,
+               elementsBeforeLast, classID, typeSize, rollbackStart, rollbackChunk, nextChunk,
+               nextElement)
 
 TEST(Layout, NumericAttributes) {
-    layout::expectPlaces({SLOT(2, NumericAttr, IsValid), SLOT(3, NumericAttr, Validate)});
-    layout::expectOrder({FIELD(OpenedAttr, valid), FIELD(OpenedAttr, error),
-                         FIELD(SizeAttribute, m), FIELD(SizeAttribute, n),
-                         FIELD(SizeAttribute, isMatrix), FIELD(SizeAttribute, isInfinite)});
-    layout::expectOrder({FIELD(OpenedAttr, error), FIELD(SkipAttribute, skip)});
+    struct Opened : NumericAttr {
+        using NumericAttr::error;
+        using NumericAttr::valid;
+    };
+    layout::expectSlots(2, SLOTS(NumericAttr, IsValid, Validate));
+    layout::Places size = FIELDS(Opened, valid, error);
+    const layout::Places own = FIELDS(SizeAttribute, m, n, isMatrix, isInfinite);
+    size.insert(size.end(), own.begin(), own.end());
+    layout::expectOrder(size);
+    EXPECT_LT(layout::offsetOf(&Opened::error), layout::offsetOf(&SkipAttribute::skip));
 }
 
 TEST(Layout, OutputBuffers) {
-    const std::vector<layout::Field> fields = LayoutProbe::fields<OutputBuffer>();
-    EXPECT_EQ(fields.front().offset, sizeof(void*));
-    layout::expectOrder(fields);
+    layout::expectOrder(LayoutProbe::fields<OutputBuffer>(), sizeof(void*));
 }
 
-}  // namespace
 }  // namespace Orvandeil::FileIO
