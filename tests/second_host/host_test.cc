@@ -9,6 +9,7 @@
 #include "fileio/text/output_screen_stream.h"
 #include "fileio/text/output_string_stream.h"
 #include "fileio/text/std_err_stream.h"
+#include "tests/support/raised.h"
 
 #include <cmath>
 
@@ -17,7 +18,6 @@
 namespace {
 
 using namespace Orvandeil::FileIO;
-using foundation::core::except::IMsgIDException;
 using own_host::Array;
 using own_host::chars;
 using own_host::doubles;
@@ -33,22 +33,17 @@ private:
     std::size_t blocksBefore = 0;
 };
 
-// What formatted output prints, or the identifier that it raises.
-std::string print(std::u16string format, std::vector<const vxArray*> arguments) {
+// What formatted output prints, or what it raises.
+std::string print(const std::u16string& format, std::vector<const vxArray*> arguments) {
     outputStringStream out("UTF-8");
-    try {
-        printfController controller(std::move(format), &out, arguments.data(),
-                                    static_cast<int>(arguments.size()));
-        controller.doPrintf();
-    } catch (const IMsgIDException& error) {
-        return error.GetID();
-    }
+    const auto count = static_cast<int>(arguments.size());
+    const std::string raised = fileio_tests::raisedBy(
+        [&] { printfController(format, &out, arguments.data(), count).doPrintf(); });
+    if (!raised.empty()) return raised;
     long bytes = 0;
     out.getPosition(bytes);
-    void* block = out.transferBuffer();
-    const std::string text(static_cast<const char*>(block), static_cast<std::size_t>(bytes));
-    vxMemoryFree(block);
-    return text;
+    const std::unique_ptr<void, decltype(&vxMemoryFree)> block(out.transferBuffer(), vxMemoryFree);
+    return {static_cast<const char*>(block.get()), static_cast<std::size_t>(bytes)};
 }
 
 TEST_F(SecondHost, FormatsItsArrays) {
@@ -66,42 +61,36 @@ TEST_F(SecondHost, FormatsItsArrays) {
 
 TEST_F(SecondHost, RaisesWithItsOwnMessages) {
     EXPECT_EQ(print(u"%s", {strings({nullptr}).get()}), "KESTRA:string:MissingNotSupported");
-    EXPECT_EQ(print(u"%f", {strings({u"1"}).get()}), "KESTRA:UnableToConvert");
+    EXPECT_EQ(print(u"%f", {strings({u"1"}).get()}), "KESTRA:UnableToConvert string double");
     try {
-        const outputStringStream stream("no such encoding");
+        outputStringStream("no such encoding");
         FAIL();
-    } catch (const IMsgIDException& error) {
+    } catch (const std::exception& error) {
         EXPECT_STREQ(error.what(), "KESTRA:iofun:InvalidEncoding no such encoding");
     }
-}
-
-TEST_F(SecondHost, ShowsTheConsole) {
-    FilePermission permission;
-    const Array arguments[] = {chars(u"h\u00e9"), doubles(1, 1, {3})};
-    const vxArray* list[] = {arguments[0].get(), arguments[1].get()};
-    outputScreenStream screen(stdout, permission);
-    stdErrStream errors(stderr, permission);
-    for (TcodnStream* stream : {static_cast<TcodnStream*>(&screen),  //
-                                static_cast<TcodnStream*>(&errors)}) {
-        EXPECT_TRUE(printfController(u"%s=%d.", stream, list, 2).doPrintf());
-    }
-    EXPECT_EQ(own_host::takeOutput(), "h\xE9=3.");
-    EXPECT_EQ(own_host::takeErrors(), "h\xE9=3.");
-}
-
-TEST_F(SecondHost, TakesWarnings) {
     std::u16string format = uR"(ab\)";
     EXPECT_TRUE(builtins::util::convertFormatEscSeqs(format, false));
     EXPECT_EQ(own_host::warnings().back(), "KESTRA:printf:NoControlCharacterInFormat");
 }
 
+TEST_F(SecondHost, ShowsTheConsole) {
+    FilePermission permission;
+    const Array text = chars(u"h\u00e9"), number = doubles(1, 1, {3});
+    const vxArray* list[] = {text.get(), number.get()};
+    outputScreenStream screen(stdout, permission);
+    stdErrStream errors(stderr, permission);
+    EXPECT_TRUE(printfController(u"%s=%d.", &screen, list, 2).doPrintf());
+    EXPECT_TRUE(printfController(u"%s=%d!", &errors, list, 2).doPrintf());
+    EXPECT_EQ(own_host::takeOutput(), "h\xE9=3.");
+    EXPECT_EQ(own_host::takeErrors(), "h\xE9=3!");
+}
+
 TEST_F(SecondHost, ReceivesBuffersAsArrays) {
     OutputBuffer buffer(vxDOUBLE_CLASS, 1, 1, 2);
-    const float values[] = {1.5F, 2.5F, 3.5F};
-    for (const float& value : values)
+    for (const float value : {1.5F, 2.5F, 3.5F})
         buffer.AppendData(vxSINGLE_CLASS, &value, 1);
-    const SizeAttribute size(doubles(1, 2, {2, HUGE_VAL}).get());
-    const Array array(buffer.TransferArray(size, false));
+    const Array array(
+        buffer.TransferArray(SizeAttribute(doubles(1, 2, {2, HUGE_VAL}).get()), false));
     EXPECT_EQ(vxArrayDimensions(array.get())[0], 2u);
     EXPECT_EQ(vxArrayDimensions(array.get())[1], 2u);
     const auto* elements = static_cast<const double*>(vxArrayData(array.get()));
@@ -116,11 +105,7 @@ TEST_F(SecondHost, RunsOutOfItsMemory) {
     for (std::size_t bytes = 0; printed != "1;2.500000e+00;3.000000e+300;"; bytes += 64) {
         ASSERT_LT(bytes, 1u << 20) << printed;
         own_host::memory().limit = own_host::memory().bytes + bytes;
-        try {
-            printed = print(u"%d;", {numbers.get()});
-        } catch (...) {
-            ADD_FAILURE() << "no other error may escape";
-        }
+        EXPECT_NO_THROW(printed = print(u"%d;", {numbers.get()})) << "no other error may escape";
         own_host::memory().limit = limit;
     }
 }
