@@ -1,5 +1,6 @@
 #include "embedded/builtins/scan.h"
 
+#include "embedded/services/memory.h"
 #include "fileio/buffers/output_buffer.h"
 #include "fileio/errors/code_list.h"
 #include "fileio/scanf/scan_control.h"
@@ -46,8 +47,13 @@ ScanResult scanStream(TcodnStream& stream, const std::u16string& format,
     ScanResult result;
     const unsigned long limit = size.isInfinite ? 0 : size.m * size.n;
     scanControl control(limit, size.isInfinite, result.count, stream, parser, values);
-    control.performMainScan();
-    result.code = control.getError();
+    try {
+        control.performMainScan();
+        result.code = control.getError();
+    } catch (const OutOfMemoryError&) {
+        // One field too long for the memory leaves the values before it.
+        result.code = code::NoMemory;
+    }
     result.array = shaped(values, size);
     return result;
 }

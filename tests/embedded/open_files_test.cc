@@ -5,6 +5,7 @@
 #include "embedded/builtins/scan.h"
 #include "embedded/builtins/spool.h"
 #include "embedded/builtins/text_lines.h"
+#include "embedded/services/memory.h"
 #include "fileio/errors/code_list.h"
 #include "tests/support/printing.h"
 #include "tests/support/test_files.h"
@@ -148,6 +149,24 @@ TEST(Lines, EndAtTerminatorsAndLimits) {
     auto output = openFile(content.path(), {"w", "n", ""});
     EXPECT_EQ(codeOf([&] { readLine(*output); }), code::IsOpenWrite);
     EXPECT_EQ(codeOf([&] { scan(*output, u"%d", SizeAttribute()); }), code::IsOpenWrite);
+}
+
+TEST(Scan, KeepsTheValuesBeforeAFieldTooLongForTheMemory) {
+    const std::u16string text = u"7 " + std::u16string(5000, u'x');
+    ScanResult result;
+    bool kept = false;
+    for (std::size_t nth = 1; result.count < 2; ++nth) {
+        const FailingAllocation failing(nth);
+        try {
+            result = scanText(text, "", u"%d%s", SizeAttribute());
+        } catch (const OutOfMemoryError&) {
+            continue;
+        }
+        EXPECT_EQ(result.code, failing.happened() ? code::NoMemory : 0) << "allocation " << nth;
+        EXPECT_EQ(vxArrayDimensions(result.array.get())[0], result.count < 2 ? result.count : 5001);
+        kept |= result.count == 1;
+    }
+    EXPECT_TRUE(kept);
 }
 
 TEST(Print, WritesToFilesAndTellsFailures) {
