@@ -102,8 +102,12 @@ ScanResult scan(OpenFile& file, const std::u16string& format, const SizeAttribut
     // A stream that cannot be read from would deliver zeros for ever.
     requireReadable(file);
     beginTransfer(file, Direction::Reading);
+    const bool hadFileError = std::ferror(file.handle.get()) != 0;
     ScanResult result = scanStream(*file.stream, format, size);
     const bool hasFileError = std::ferror(file.handle.get()) != 0;
+    // To literals and scansets any read that brings nothing is the end of the data.
+    const bool isHiddenError = hasFileError && !hadFileError && result.code == 0;
+    if (isHiddenError) result.code = file.stream->getErrorCode();
     if (!isQuietEnd(result.code, hasFileError)) result.failure = file.failure(result.code);
     result.position = positionIn(file);
     return result;

@@ -21,7 +21,8 @@ struct ScanResult {
 
 // Both scans run a valid size's number of values, or to the end of the data. The end of the data
 // (0) and input that does not match (-9, and -1 while the file has no error) are quiet ends; values
-// stored before any other end are delivered too.
+// stored before any other end are delivered too. A read that failed is told as such, whatever
+// conversion met it, and a field too long for the memory by -11.
 
 // Reads from the current position; positions are bytes from the beginning of the file. CodeError
 // -5, -31 and -33 when nothing can be read at all.
