@@ -30,9 +30,10 @@ int outputScreenStream::print(const char* format, std::va_list arguments) {
 
 int outputScreenStream::printCommon(const char* format, std::va_list arguments) {
     bool refused = false;
+    // The console's text ends at a NUL, in whatever piece that is.
     const auto put = [&refused](const char* text, std::size_t count) {
         refused = vxConsolePutString(std::string(text, count).c_str()) == -1;
-        return !refused;
+        return !refused && std::memchr(text, '\0', count) == nullptr;
     };
     std::string block;
     const int length = detail::formatPiecewise(put, block, format, arguments);

@@ -47,6 +47,9 @@ TEST_F(ConsoleStreams, TextIsCountedInUnitsAndInBytes) {
     expectCounts(out, 15, 8);
     out.PutString(std::u16string(10001, u'\u3042'));
     EXPECT_EQ(output.text.size(), 13u + 3 * 10001);
+    output.text.clear();
+    EXPECT_EQ(out.printf("a%c%70000d", 0, 7), 70002);
+    EXPECT_EQ(output.text, "a");
 }
 
 TEST_F(ConsoleStreams, FlushTellsTheBadBit) {
