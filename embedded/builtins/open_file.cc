@@ -16,15 +16,15 @@ void begin(OpenFile& file, Direction direction, int isBitTransfer, int dataSizeT
         throw CodeError(carryFailure(file));
     }
     if (isBitTransfer != 0) file.carry().active = true;
-    const Direction before = std::exchange(file.direction, direction);
     // Bits that are appended are merged with what stands at the end, not where the file was opened.
     const bool mergesAtEnd =
         isBitTransfer != 0 && !isRead && file.permission.append && file.permission.update;
-    const bool turns = before != Direction::None && before != direction;
-    if (file.stream->isScreen() || !(turns || mergesAtEnd)) return;
-    if (fseeko(file.handle.get(), 0, mergesAtEnd ? SEEK_END : SEEK_CUR) != 0) {
+    const bool turns = file.direction != Direction::None && file.direction != direction;
+    const bool moves = !file.stream->isScreen() && (turns || mergesAtEnd);
+    if (moves && fseeko(file.handle.get(), 0, mergesAtEnd ? SEEK_END : SEEK_CUR) != 0) {
         throw CodeError(file.failure(code::FseekFailed));
     }
+    file.direction = direction;
 }
 
 }  // namespace
