@@ -1,6 +1,7 @@
 #include "cli/files.h"
 #include "cli/verb.h"
 #include "embedded/builtins/text_lines.h"
+#include "fileio/host/exception.h"
 #include "fileio/host/text.h"
 
 #include <string>
@@ -31,6 +32,10 @@ std::optional<embedded::Failure> showLines(embedded::OpenFile& file, long maxCha
             show(*line, terminators, report);
     } catch (const embedded::CodeError& error) {
         return embedded::Failure{error.code, error.what()};
+    } catch (const foundation::core::except::IMsgIDException&) {
+        // Raised while reading, between two lines of the list.
+        if (report.isJson()) report.object().endList();
+        throw;
     }
     return std::nullopt;
 }

@@ -38,12 +38,24 @@ void refuseDirectory(const OpenFile& file) {
     if (S_ISDIR(status.st_mode)) throw CodeError(file.failure(EISDIR));
 }
 
-// `path` is where the file can be opened a second time.
+// `name` is where the file can be opened a second time.
 std::unique_ptr<OpenFile> withFileStream(std::unique_ptr<OpenFile> file,
-                                         const std::string& encoding, const std::string& path) {
+                                         const std::string& encoding, std::u16string name) {
     file->stream = std::make_unique<fileStream>(file->handle.get(), encoding, file->permission,
-                                                vxTextFromNarrow(path.data(), path.size()));
+                                                std::move(name));
     return file;
+}
+
+std::u16string nameByDescriptor(const OpenFile& file) {
+    const std::string path = "/dev/fd/" + std::to_string(fileno(file.handle.get()));
+    return vxTextFromNarrow(path.data(), path.size());
+}
+
+// A path that is no text would lead elsewhere.
+std::u16string nameFromPath(const std::string& path, const OpenFile& file) {
+    std::u16string name = vxTextFromNarrow(path.data(), path.size());
+    const bool isText = vxTextToNarrow(name.data(), name.size()) == path;
+    return isText ? name : nameByDescriptor(file);
 }
 
 template <class Console>
@@ -65,7 +77,8 @@ std::unique_ptr<OpenFile> openFile(const std::string& name, const OpenRequest& r
     if (!handle) throw CodeError(errno, name);
     auto file = std::make_unique<OpenFile>(name, std::move(handle), permission, format);
     refuseDirectory(*file);
-    file = withFileStream(std::move(file), request.encoding, name);
+    std::u16string streamName = nameFromPath(name, *file);
+    file = withFileStream(std::move(file), request.encoding, std::move(streamName));
     // An emptied file shows its encoding now. Later, what is written first could be taken for it.
     if (permission.write) file->stream->GetConv(0);
     return file;
@@ -77,15 +90,15 @@ std::unique_ptr<OpenFile> openStandardInput(const std::string& encoding) {
                                            MachineFormat());
     refuseDirectory(*file);
     if (fseeko(stdin, 0, SEEK_CUR) != 0) file->handle = spool(stdin, file->label);
-    const std::string path = "/dev/fd/" + std::to_string(fileno(file->handle.get()));
-    return withFileStream(std::move(file), encoding, path);
+    std::u16string name = nameByDescriptor(*file);
+    return withFileStream(std::move(file), encoding, std::move(name));
 }
 
 std::unique_ptr<OpenFile> openStandardOutput(const std::string& encoding) {
     auto file = std::make_unique<OpenFile>("standard output", FileHandle(stdout),
                                            validPermission("w"), MachineFormat());
     // Nothing is there to be detected.
-    return withFileStream(std::move(file), encoding.empty() ? "UTF-8" : encoding, "");
+    return withFileStream(std::move(file), encoding.empty() ? "UTF-8" : encoding, u"");
 }
 
 std::unique_ptr<OpenFile> openConsole() {
