@@ -217,16 +217,17 @@ std::string shownOn(int terminal, int reader, ProgressLine::Delay delay, int pat
     const TempFile content(std::string(3 << 20, 'x'));
     std::FILE* const file = std::fopen(content.path().c_str(), "r");
     fseeko(file, 1 << 20, SEEK_SET);
+    pollfd something = {reader, POLLIN, 0};
     {
         const ProgressLine progress(fileno(file), "reading x", terminal, delay);
-        pollfd something = {reader, POLLIN, 0};
         poll(&something, 1, patience);
     }
     std::fclose(file);
-    fcntl(reader, F_SETFL, O_NONBLOCK);
-    char shown[1000];
-    const ssize_t count = ::read(reader, shown, sizeof shown);
-    return {shown, static_cast<std::size_t>(std::max<ssize_t>(count, 0))};
+    // A terminal hands on with a delay what was written.
+    std::string shown;
+    for (char byte = 0; poll(&something, 1, 100) > 0 && ::read(reader, &byte, 1) == 1;)
+        shown += byte;
+    return shown;
 }
 
 TEST(ProgressLine, IsForTerminalsAndLongTransfers) {
