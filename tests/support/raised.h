@@ -1,5 +1,6 @@
 #pragma once
 
+#include "embedded/builtins/code_error.h"
 #include "fileio/host/exception.h"
 
 #include <string>
@@ -19,6 +20,17 @@ std::string raisedBy(Run run) {
         return raised;
     }
     return "";
+}
+
+// The code that a built-in ends with; 0 when it does its work.
+template <class Run>
+int codeOf(Run run) {
+    try {
+        run();
+    } catch (const Orvandeil::FileIO::embedded::CodeError& error) {
+        return error.code;
+    }
+    return 0;
 }
 
 }  // namespace fileio_tests

@@ -2,7 +2,9 @@
 
 #include "fileio/buffers/output_buffer.h"
 #include "fileio/text/tcodn_stream.h"
+#include "tests/support/test_files.h"
 
+#include <cerrno>
 #include <string>
 #include <string_view>
 
@@ -26,11 +28,14 @@ struct Scanned {
 Scanned scan(Orvandeil::FileIO::TcodnStream& stream, std::string_view format, long limit);
 
 // The same over a file, a file that cannot seek, and a text in memory; read-ahead of a few bytes.
-Scanned scanFile(std::string_view input, std::string_view format, long limit,
-                 const std::string& encoding = "UTF-8");
-Scanned scanPipe(std::string_view input, std::string_view format, long limit,
-                 const std::string& encoding = "UTF-8");
-Scanned scanText(std::string_view input, std::string_view format, long limit,
-                 const std::string& encoding = "UTF-8");
+Scanned scanBytes(FaultyFile file, std::string_view format, long limit);
+inline Scanned scanFile(std::string_view input, std::string_view format, long limit) {
+    return scanBytes({.bytes = std::string(input)}, format, limit);
+}
+inline Scanned scanPipe(std::string_view input, std::string_view format, long limit) {
+    const std::string bytes(input);
+    return scanBytes({.bytes = bytes, .failingSeek = 1, .error = ESPIPE}, format, limit);
+}
+Scanned scanText(std::string_view input, std::string_view format, long limit);
 
 }  // namespace support

@@ -4,7 +4,7 @@
 
 #include <algorithm>
 #include <cerrno>
-#include <cstdlib>
+#include <filesystem>
 #include <fstream>
 #include <iterator>
 #include <unistd.h>
@@ -12,19 +12,19 @@
 namespace support {
 namespace {
 
+// Whether a call is to fail, errno being set then.
 bool fails(int call, int failingCall, int error) {
-    if (failingCall == 0 || call < failingCall) return false;
-    errno = error;
-    return true;
+    const bool isToFail = failingCall != 0 && call >= failingCall;
+    if (isToFail) errno = error;
+    return isToFail;
 }
 
 ssize_t readBytes(void* cookie, char* buffer, std::size_t size) {
     auto& file = *static_cast<FaultyFile*>(cookie);
     if (fails(++file.reads, file.failingRead, file.error)) return -1;
     const std::size_t start = std::min(file.offset, file.bytes.size());
-    const std::size_t count = file.bytes.copy(buffer, size, start);
-    file.offset = start + count;
-    return static_cast<ssize_t>(count);
+    file.offset = start + file.bytes.copy(buffer, size, start);
+    return static_cast<ssize_t>(file.offset - start);
 }
 
 ssize_t writeBytes(void* cookie, const char* buffer, std::size_t size) {
@@ -39,10 +39,9 @@ ssize_t writeBytes(void* cookie, const char* buffer, std::size_t size) {
 int seek(void* cookie, off64_t* offset, int whence) {
     auto& file = *static_cast<FaultyFile*>(cookie);
     if (fails(++file.seeks, file.failingSeek, file.error)) return -1;
-    const std::size_t base = whence == SEEK_SET   ? 0
-                             : whence == SEEK_CUR ? file.offset
-                                                  : file.bytes.size();
-    *offset += static_cast<off64_t>(base);
+    const std::size_t origins[] = {0, file.offset, file.bytes.size()};
+    static_assert(SEEK_SET == 0 && SEEK_CUR == 1 && SEEK_END == 2);
+    *offset += static_cast<off64_t>(origins[whence]);
     if (*offset < 0) return -1;
     file.offset = static_cast<std::size_t>(*offset);
     return 0;
@@ -51,14 +50,9 @@ int seek(void* cookie, off64_t* offset, int whence) {
 }  // namespace
 
 TempFile::TempFile(std::string_view content) {
-    const char* folder = std::getenv("TMPDIR");
-    filePath = std::string(folder ? folder : "/tmp") + "/fileio_test_XXXXXX";
+    filePath = std::filesystem::temp_directory_path() / "fileio_test_XXXXXX";
     close(mkstemp(filePath.data()));
     std::ofstream(filePath, std::ios::binary) << content;
-}
-
-TempFile::~TempFile() {
-    unlink(filePath.c_str());
 }
 
 std::string TempFile::content() const {
@@ -74,10 +68,6 @@ OpenedFile::OpenedFile(const std::string& path, const char* mode, const std::str
 OpenedFile::OpenedFile(std::FILE* openFile, const char* mode, const std::string& encoding)
     : permission(mode, false), file(openFile), stream(file, encoding, permission, u"") {}
 
-OpenedFile::~OpenedFile() {
-    std::fclose(file);
-}
-
 std::string OpenedFile::read(unsigned long count) {
     std::string bytes;
     char byte = 0;
@@ -92,9 +82,10 @@ long OpenedFile::position() {
     return position;
 }
 
-std::FILE* FaultyFile::open(const char* mode) {
+std::FILE* FaultyFile::open(const char* mode, std::size_t bufferSize) {
     std::FILE* const file = fopencookie(this, mode, {readBytes, writeBytes, seek, nullptr});
-    std::setvbuf(file, nullptr, _IONBF, 0);
+    buffer.resize(bufferSize);
+    std::setvbuf(file, buffer.data(), bufferSize == 0 ? _IONBF : _IOFBF, bufferSize);
     return file;
 }
 

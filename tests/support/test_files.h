@@ -14,7 +14,7 @@ namespace support {
 class TempFile {
 public:
     explicit TempFile(std::string_view content = {});
-    ~TempFile();
+    ~TempFile() { std::remove(filePath.c_str()); }
     TempFile(const TempFile&) = delete;
     TempFile& operator=(const TempFile&) = delete;
 
@@ -31,7 +31,7 @@ struct OpenedFile {
                         const std::string& encoding = "");
     // Takes over a file opened in another way.
     OpenedFile(std::FILE* openFile, const char* mode, const std::string& encoding = "");
-    ~OpenedFile();
+    ~OpenedFile() { std::fclose(file); }
 
     // Reads up to `count` bytes one by one.
     std::string read(unsigned long count);
@@ -42,20 +42,18 @@ struct OpenedFile {
     Orvandeil::FileIO::fileStream stream;
 };
 
-// A file in memory, unbuffered. From a given call on (counted from 1, 0 is never), its reads,
-// writes or seeks fail with `error`, which may be 0.
+// A file in memory. From a given call on (counted from 1, 0 is never), its reads, writes or seeks
+// fail with `error`, which may be 0.
 struct FaultyFile {
-    std::FILE* open(const char* mode);
+    // The standard library keeps `bufferSize` bytes, or none.
+    std::FILE* open(const char* mode, std::size_t bufferSize = 0);
 
     std::string bytes;
     std::size_t offset = 0;
-    int failingRead = 0;
-    int failingWrite = 0;
-    int failingSeek = 0;
+    int failingRead = 0, failingWrite = 0, failingSeek = 0;
     int error = 0;
-    int reads = 0;
-    int writes = 0;
-    int seeks = 0;
+    int reads = 0, writes = 0, seeks = 0;
+    std::string buffer = {};
 };
 
 }  // namespace support
