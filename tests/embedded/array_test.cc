@@ -2,89 +2,63 @@
 
 #include "embedded/services/memory.h"
 #include "fileio/host/memory.h"
-
-#include <numeric>
+#include "tests/support/arrays.h"
 
 #include <gtest/gtest.h>
 
 namespace {
 
 using namespace Orvandeil::FileIO::embedded;
-
-Dimensions dimensionsOf(const ArrayPtr& array) {
-    const std::size_t* first = vxArrayDimensions(array.get());
-    return Dimensions(first, first + vxArrayDimensionCount(array.get()));
-}
+using support::shown;
 
 TEST(HostArrays, NumericClasses) {
-    const struct {
-        int line;
-        vxClassID classID;
-        const char* name;
-        std::size_t bytes;
-    } rows[] = {
-        {__LINE__, vxLOGICAL_CLASS, "logical", 1}, {__LINE__, vxCHAR_CLASS, "char", 2},
-        {__LINE__, vxDOUBLE_CLASS, "double", 8},   {__LINE__, vxSINGLE_CLASS, "single", 4},
-        {__LINE__, vxINT8_CLASS, "int8", 1},       {__LINE__, vxUINT8_CLASS, "uint8", 1},
-        {__LINE__, vxINT16_CLASS, "int16", 2},     {__LINE__, vxUINT16_CLASS, "uint16", 2},
-        {__LINE__, vxINT32_CLASS, "int32", 4},     {__LINE__, vxUINT32_CLASS, "uint32", 4},
-        {__LINE__, vxINT64_CLASS, "int64", 8},     {__LINE__, vxUINT64_CLASS, "uint64", 8},
-    };
-    for (const auto& row : rows) {
-        SCOPED_TRACE(row.line);
-        const ArrayPtr array(vxCreateNumericMatrix(2, 3, row.classID, vxCOMPLEX));
-        EXPECT_EQ(vxArrayClassID(array.get()), row.classID);
-        EXPECT_STREQ(vxArrayClassName(array.get()), row.name);
-        EXPECT_EQ(elementBytes(row.classID), row.bytes);
+    const char* const names[] = {"logical", "char",   "",      "double", "single", "int8",  "uint8",
+                                 "int16",   "uint16", "int32", "uint32", "int64",  "uint64"};
+    const std::size_t bytes[] = {1, 2, 0, 8, 4, 1, 1, 2, 2, 4, 4, 8, 8};
+    for (int i = vxLOGICAL_CLASS; i <= vxUINT64_CLASS; ++i) {
+        const auto classID = static_cast<vxClassID>(i);
+        EXPECT_EQ(elementBytes(classID), bytes[i - vxLOGICAL_CLASS]);
+        if (elementBytes(classID) == 0) continue;
+        const ArrayPtr array(vxCreateNumericMatrix(1, 2, classID, vxCOMPLEX));
+        EXPECT_EQ(vxArrayClassID(array.get()), classID);
+        EXPECT_EQ(shown(array), std::string(names[i - vxLOGICAL_CLASS]) + " 1x2: 0 0 + i 0 0");
         EXPECT_EQ(vxArrayFirstAsDouble(array.get()), 0);
-        EXPECT_TRUE(vxArrayIsComplex(array.get()));
-        const auto* bytes = static_cast<const char*>(vxArrayData(array.get()));
-        EXPECT_EQ(std::accumulate(bytes, bytes + 6 * row.bytes, 0), 0);
     }
+}
+
+std::string shapeOf(const Dimensions& lengths) {
+    const ArrayPtr array = makeNumeric(vxINT8_CLASS, lengths);
+    return shown(array) + (vxArrayIsVector(array.get()) ? ", vector" : "") +
+           (vxArrayIsScalar(array.get()) ? ", scalar" : "");
 }
 
 TEST(HostArrays, Shapes) {
-    const struct {
-        int line;
-        Dimensions lengths;
-        bool vector;
-        bool scalar;
-        std::size_t count;
-    } rows[] = {
-        {__LINE__, {1, 1}, true, true, 1},       {__LINE__, {1, 5}, true, false, 5},
-        {__LINE__, {5, 1}, true, false, 5},      {__LINE__, {2, 3}, false, false, 6},
-        {__LINE__, {0, 0}, false, false, 0},     {__LINE__, {1, 0}, true, false, 0},
-        {__LINE__, {2, 3, 4}, false, false, 24}, {__LINE__, {1, 1, 2}, false, false, 2},
-    };
-    for (const auto& row : rows) {
-        SCOPED_TRACE(row.line);
-        const ArrayPtr array = makeNumeric(vxINT16_CLASS, row.lengths);
-        EXPECT_EQ(dimensionsOf(array), row.lengths);
-        EXPECT_EQ(vxArrayIsVector(array.get()), row.vector);
-        EXPECT_EQ(vxArrayIsScalar(array.get()), row.scalar);
-        EXPECT_EQ(elementCount(*array), row.count);
-    }
-    EXPECT_EQ(dimensionsOf(makeChars(u"")), (Dimensions{0, 0}));
-    EXPECT_EQ(dimensionsOf(makeChars(u"abc")), (Dimensions{1, 3}));
-    EXPECT_EQ(dimensionsOf(makeNumeric(vxINT8_CLASS, {})), (Dimensions{1, 1}));
+    EXPECT_EQ(shapeOf({}), "int8 1x1: 0, vector, scalar");
+    EXPECT_EQ(shapeOf({1, 2}), "int8 1x2: 0 0, vector");
+    EXPECT_EQ(shapeOf({2, 1}), "int8 2x1: 0 0, vector");
+    EXPECT_EQ(shapeOf({2, 2}), "int8 2x2: 0 0 0 0");
+    EXPECT_EQ(shapeOf({0, 0}), "int8 0x0: ");
+    EXPECT_EQ(shapeOf({1, 0}), "int8 1x0: , vector");
+    EXPECT_EQ(shapeOf({1, 1, 2}), "int8 1x1x2: 0 0");
+    EXPECT_EQ(shown(makeChars(u"")), "char 0x0: ");
+    EXPECT_EQ(shown(makeChars(u"ab")), "char 1x2: 97 98");
 }
 
 TEST(HostArrays, TakeOverBlocks) {
     const std::size_t before = liveBlockCount();
-    {
-        const ArrayPtr array = makeNumeric(vxUINT8_CLASS, {1, 1});
-        auto* block = static_cast<unsigned char*>(vxMemoryAllocateOrRaise(4));
-        block[0] = 200;
-        vxArraySetData(array.get(), block);
-        vxArraySetRows(array.get(), 2);
-        vxArraySetColumns(array.get(), 2);
-        EXPECT_EQ(liveBlockCount(), before + 1);
-        EXPECT_EQ(vxArrayData(array.get()), block);
-        EXPECT_EQ(vxArrayFirstAsDouble(array.get()), 200);
-        EXPECT_EQ(dimensionsOf(array), (Dimensions{2, 2}));
-        vxArraySetData(array.get(), nullptr);
-        EXPECT_EQ(liveBlockCount(), before);
-    }
+    const ArrayPtr array = makeNumeric(vxUINT8_CLASS, {1, 1});
+    auto* block = static_cast<unsigned char*>(vxMemoryAllocateOrRaise(2));
+    block[0] = 200;
+    block[1] = 7;
+    vxArraySetData(array.get(), block);
+    vxArraySetRows(array.get(), 2);
+    vxArraySetColumns(array.get(), 1);
+    EXPECT_EQ(liveBlockCount(), before + 1);
+    EXPECT_EQ(vxArrayData(array.get()), block);
+    EXPECT_EQ(vxArrayFirstAsDouble(array.get()), 200);
+    EXPECT_EQ(shown(array), "uint8 2x1: 200 7");
+    vxArraySetData(array.get(), nullptr);
+    EXPECT_EQ(liveBlockCount(), before);
     vxArrayDestroy(nullptr);
 }
 
@@ -98,9 +72,8 @@ TEST(HostArrays, CellsAndStructsOwnTheirContents) {
         const ArrayPtr copy = copyOf(*structure);
         for (const ArrayPtr* array : {&structure, &copy}) {
             const vxArray* subs = structField(**array, "subs");
-            ASSERT_NE(subs, nullptr);
-            EXPECT_STREQ(vxArrayClassName(subs), "cell");
-            EXPECT_EQ(vxArrayFirstAsDouble(cellContent(*subs)), 3);
+            EXPECT_EQ(shown(subs), "cell 1x1: ");
+            EXPECT_EQ(shown(cellContent(*subs)), "double 1x1: 3");
             EXPECT_EQ(structField(**array, "other"), nullptr);
             EXPECT_EQ(cellContent(**array), nullptr);
         }

@@ -1,6 +1,7 @@
 #include "embedded/services/dispatch.h"
 
-#include "fileio/host/exception.h"
+#include "tests/support/arrays.h"
+#include "tests/support/raised.h"
 
 #include <cmath>
 
@@ -9,25 +10,15 @@
 namespace {
 
 using namespace Orvandeil::FileIO::embedded;
-using foundation::core::except::IMsgIDException;
 
-ArrayPtr call(const char* name, std::initializer_list<const vxArray*> inputs) {
-    return ArrayPtr(vxDispatchCall(name, inputs.begin(), inputs.size()));
-}
-
-std::string identifierRaisedBy(const char* name, std::initializer_list<const vxArray*> inputs) {
-    try {
-        call(name, inputs);
-    } catch (const IMsgIDException& error) {
-        return error.GetID();
-    }
-    return "";
-}
-
-std::vector<double> doublesOf(const ArrayPtr& array) {
-    if (!array || vxArrayClassID(array.get()) != vxDOUBLE_CLASS) return {};
-    const auto* first = static_cast<const double*>(vxArrayData(array.get()));
-    return std::vector<double>(first, first + elementCount(*array));
+// What the function returns or raises.
+template <class... Inputs>
+std::string call(const char* name, const Inputs&... inputs) {
+    const std::vector<const vxArray*> list = {inputs.get()...};
+    std::string result;
+    const std::string raised = fileio_tests::raisedBy(
+        [&] { result = support::shown(ArrayPtr(vxDispatchCall(name, list.data(), list.size()))); });
+    return raised + result;
 }
 
 ArrayPtr subscriptOf(ArrayPtr index) {
@@ -36,78 +27,35 @@ ArrayPtr subscriptOf(ArrayPtr index) {
     return ArrayPtr(vxCreateStructScalar(2, names, values));
 }
 
-TEST(Dispatch, SizeOfAnything) {
-    EXPECT_EQ(doublesOf(call("size", {makeNumeric(vxINT8_CLASS, {2, 0, 4}).get()})),
-              (std::vector<double>{2, 0, 4}));
-    EXPECT_EQ(doublesOf(call("size", {makeStrings({u"a", u"b"}, {2, 1}).get()})),
-              (std::vector<double>{2, 1}));
-}
-
 TEST(Dispatch, StringElements) {
-    const ArrayPtr strings = makeStrings({u"one", std::nullopt, u""}, {1, 3});
-    const ArrayPtr second = subscriptOf(makeScalar(2));
-    EXPECT_TRUE(vxStringArrayIsMissing(call("subsref", {strings.get(), second.get()}).get(), 0));
-    const ArrayPtr first = call("subsref", {strings.get(), subscriptOf(makeScalar(1)).get()});
-    ASSERT_TRUE(vxStringArrayIs(first.get()));
-    EXPECT_TRUE(vxStringArrayText(first.get(), 0) == u"one");
-    EXPECT_FALSE(vxStringArrayIs(makeChars(u"one").get()));
-
-    for (const double bad : {0.0, 4.0, 1.5, -1.0, double(NAN), double(INFINITY)}) {
-        const ArrayPtr index = subscriptOf(makeScalar(bad));
-        EXPECT_EQ(identifierRaisedBy("subsref", {strings.get(), index.get()}),
-                  "KESTRA:badsubscript");
+    const ArrayPtr strings = makeStrings({u"one", std::nullopt, u""}, {3, 1});
+    EXPECT_EQ(call("size", strings), "double 1x2: 3 1");
+    const char* const elements[] = {"'one'", "missing", "''"};
+    for (const int i : {1, 2, 3}) {
+        EXPECT_EQ(call("subsref", strings, subscriptOf(makeScalar(i))),
+                  std::string("string 1x1: ") + elements[i - 1]);
     }
-    const ArrayPtr pair = subscriptOf(makeDoubles(1, 2, {1, 2}));
-    EXPECT_EQ(identifierRaisedBy("subsref", {strings.get(), pair.get()}), "KESTRA:badsubscript");
+    for (const double bad : {0.0, 4.0, 1.5, -1.0, double(NAN), double(INFINITY)})
+        EXPECT_EQ(call("subsref", strings, subscriptOf(makeScalar(bad))), "KESTRA:badsubscript");
+    EXPECT_EQ(call("subsref", strings, subscriptOf(makeDoubles(1, 2, {1, 2}))),
+              "KESTRA:badsubscript");
 }
 
-TEST(Dispatch, StringConversions) {
-    const ArrayPtr word = makeString(u"4.5e1");
-    const ArrayPtr text = call("char", {word.get()});
-    ASSERT_EQ(vxArrayClassID(text.get()), vxCHAR_CLASS);
-    EXPECT_EQ(elementCount(*text), 5u);
-    EXPECT_TRUE(vxStringArrayText(call("string", {word.get()}).get(), 0) == u"4.5e1");
-    EXPECT_EQ(call("int64", {word.get()}), nullptr);
-    EXPECT_EQ(call("uint64", {word.get()}), nullptr);
-    EXPECT_EQ(call("int8", {word.get()}), nullptr);
-
-    const ArrayPtr missing = makeString(std::nullopt);
-    for (const char* name : {"char", "int64", "uint64"}) {
-        EXPECT_EQ(identifierRaisedBy(name, {missing.get()}), "KESTRA:string:MissingNotSupported");
-    }
-    EXPECT_EQ(identifierRaisedBy("char", {makeStrings({u"a", u"b"}, {1, 2}).get()}),
+TEST(Dispatch, Conversions) {
+    const ArrayPtr word = makeString(u"4e1");
+    EXPECT_EQ(call("char", word), "char 1x3: 52 101 49");
+    EXPECT_EQ(call("string", word), "string 1x1: '4e1'");
+    for (const char* name : {"int64", "uint64", "int8"})
+        EXPECT_EQ(call(name, word), "none");
+    for (const char* name : {"char", "int64", "uint64"})
+        EXPECT_EQ(call(name, makeString(std::nullopt)), "KESTRA:string:MissingNotSupported");
+    EXPECT_EQ(call("char", makeStrings({u"a", u"b"}, {1, 2})),
               "KESTRA:string:MustBeStringScalarOrCharacterVector");
-}
-
-TEST(Dispatch, NumbersThatStringsSpell) {
-    const struct {
-        int line;
-        StringElement text;
-        double value;
-    } rows[] = {
-        {__LINE__, u"12", 12},      {__LINE__, u"-1e3", -1000},    {__LINE__, u"+Inf", INFINITY},
-        {__LINE__, u"12x", NAN},    {__LINE__, u" 12", NAN},       {__LINE__, u"", NAN},
-        {__LINE__, u"\u0661", NAN}, {__LINE__, std::nullopt, NAN},
-    };
-    for (const auto& row : rows) {
-        SCOPED_TRACE(row.line);
-        const double value = doublesOf(call("double", {makeString(row.text).get()})).at(0);
-        EXPECT_TRUE(value == row.value || (std::isnan(value) && std::isnan(row.value)));
-    }
-    // One rounding: by way of double this halfway case would go down to the even neighbour.
-    const ArrayPtr single = call("single", {makeString(u"1.00000005960464477541").get()});
-    ASSERT_EQ(vxArrayClassID(single.get()), vxSINGLE_CLASS);
-    EXPECT_EQ(vxArrayFirstAsDouble(single.get()), 1.00000011920928955078125);
-}
-
-TEST(Dispatch, DoublesOfNumbers) {
-    EXPECT_EQ(doublesOf(call("double", {makeRow<std::int8_t>(vxINT8_CLASS, {-3, 5}).get()})),
-              (std::vector<double>{-3, 5}));
-    const ArrayPtr complex = makeNumeric(vxSINGLE_CLASS, {1, 1}, vxCOMPLEX);
+    EXPECT_EQ(call("double", makeRow<std::int8_t>(vxINT8_CLASS, {-3, 5})), "double 1x2: -3 5");
+    const ArrayPtr complex = makeNumeric(vxSINGLE_CLASS, {1, 1, 2}, vxCOMPLEX);
     *static_cast<float*>(imaginaryData(*complex)) = 2.5F;
-    const ArrayPtr doubles = call("double", {complex.get()});
-    ASSERT_TRUE(vxArrayIsComplex(doubles.get()));
-    EXPECT_EQ(*static_cast<const double*>(imaginaryData(std::as_const(*doubles))), 2.5);
+    EXPECT_EQ(call("size", complex), "double 1x3: 1 1 2");
+    EXPECT_EQ(call("double", complex), "double 1x1x2: 0 0 + i 2.5 0");
 }
 
 TEST(Dispatch, ObjectsAnswerByTheirOwnTable) {
@@ -115,13 +63,12 @@ TEST(Dispatch, ObjectsAnswerByTheirOwnTable) {
         "Widget",
         {{"size", [](auto) { return makeScalar(7); }},
          {"double", [](auto inputs) { return makeScalar(static_cast<double>(inputs.size())); }}});
-    EXPECT_STREQ(vxArrayClassName(widget.get()), "Widget");
-    EXPECT_EQ(vxArrayData(widget.get()), nullptr);
-    EXPECT_EQ(doublesOf(call("size", {widget.get()})), std::vector<double>{7});
-    EXPECT_EQ(doublesOf(call("double", {widget.get(), widget.get()})), std::vector<double>{2});
-    EXPECT_EQ(call("char", {widget.get()}), nullptr);
-    EXPECT_EQ(call("size", {}), nullptr);
-    EXPECT_EQ(call("double", {makeObject("Plain", {}).get()}), nullptr);
+    EXPECT_EQ(support::shown(widget), "Widget 1x1: ");
+    EXPECT_EQ(call("size", widget), "double 1x1: 7");
+    EXPECT_EQ(call("double", widget, widget), "double 1x1: 2");
+    EXPECT_EQ(call("char", widget), "none");
+    EXPECT_EQ(call("size"), "none");
+    EXPECT_EQ(call("double", makeObject("Plain", {})), "none");
 }
 
 }  // namespace

@@ -1,6 +1,7 @@
 #include "embedded/services/memory.h"
 
 #include "embedded/services/array.h"
+#include "tests/support/raised.h"
 
 #include <cstdint>
 #include <cstring>
@@ -27,25 +28,16 @@ TEST(HostMemory, EmptyBlocksAreBlocks) {
 }
 
 TEST(HostMemory, SizesThatNoBlockCanHave) {
-    char kept[] = "kept";
-    void* block = vxMemoryAllocateOrRaise(sizeof kept);
-    std::memcpy(block, kept, sizeof kept);
+    void* block = vxMemoryAllocateOrRaise(5);
+    std::memcpy(block, "kept", 5);
     EXPECT_EQ(vxMemoryAllocate(SIZE_MAX), nullptr);
     EXPECT_THROW(vxMemoryAllocateOrRaise(SIZE_MAX), OutOfMemoryError);
     EXPECT_THROW(vxMemoryAllocateZeroedOrRaise(SIZE_MAX / 4, 8), OutOfMemoryError);
     EXPECT_THROW(vxMemoryReallocateOrRaise(block, SIZE_MAX), OutOfMemoryError);
-    EXPECT_STREQ(static_cast<char*>(block), kept);
+    EXPECT_STREQ(static_cast<char*>(block), "kept");
     vxMemoryFree(block);
     EXPECT_THROW(vxCreateNumericMatrix(SIZE_MAX / 2, 3, vxINT8_CLASS, vxREAL), OutOfMemoryError);
-}
-
-TEST(HostMemory, TheErrorNamesItself) {
-    try {
-        vxMemoryRaiseExhausted();
-    } catch (const foundation::core::except::IMsgIDException& error) {
-        EXPECT_EQ(error.GetID(), "KESTRA:nomem");
-        EXPECT_STREQ(error.what(), "There is not enough memory.");
-    }
+    EXPECT_EQ(fileio_tests::raisedBy(vxMemoryRaiseExhausted), "KESTRA:nomem");
 }
 
 TEST(HostMemory, EveryKindOfAllocationCanFail) {
@@ -56,18 +48,14 @@ TEST(HostMemory, EveryKindOfAllocationCanFail) {
         [&] { block = vxMemoryReallocateOrRaise(block, 16); },
     };
     for (const auto& allocate : allocations) {
-        {
-            FailingAllocation second(2);
+        for (const auto extent : {FailingAllocation::Once, FailingAllocation::Onwards}) {
+            FailingAllocation second(2, extent);
             EXPECT_NO_THROW(allocate());
             EXPECT_FALSE(second.happened());
             EXPECT_THROW(allocate(), OutOfMemoryError);
             EXPECT_TRUE(second.happened());
-            EXPECT_NO_THROW(allocate());
-        }
-        {
-            FailingAllocation everyOne(1, FailingAllocation::Onwards);
-            EXPECT_THROW(allocate(), OutOfMemoryError);
-            EXPECT_THROW(allocate(), OutOfMemoryError);
+            const bool failsAgain = fileio_tests::raisedBy(allocate) != "";
+            EXPECT_EQ(failsAgain, extent == FailingAllocation::Onwards);
         }
         EXPECT_NO_THROW(allocate());
     }
@@ -76,15 +64,15 @@ TEST(HostMemory, EveryKindOfAllocationCanFail) {
 
 TEST(HostMemory, ArraysLoseNothingWhenAnAllocationFails) {
     const std::size_t before = liveBlockCount();
-    for (std::size_t n = 1;; ++n) {
-        FailingAllocation failure(n);
-        try {
-            const ArrayPtr array = makeNumeric(vxDOUBLE_CLASS, {2, 3}, vxCOMPLEX);
-            copyOf(*array);
-        } catch (const OutOfMemoryError&) {
-        }
+    bool failed = true;
+    for (std::size_t n = 1; failed; ++n) {
+        const FailingAllocation failure(n);
+        const std::string raised = fileio_tests::raisedBy([] {
+            copyOf(*makeNumeric(vxDOUBLE_CLASS, {2, 3}, vxCOMPLEX));
+        });
+        failed = failure.happened();
+        EXPECT_EQ(raised, failed ? "KESTRA:nomem" : "");
         EXPECT_EQ(liveBlockCount(), before);
-        if (!failure.happened()) break;
         ASSERT_LT(n, 10u);
     }
 }

@@ -1,102 +1,113 @@
 #include "fileio/host/text.h"
 
-#include "fileio/host/data_sizes.h"
-
-#include <set>
+#include <cmath>
+#include <cstdio>
+#include <cstdlib>
+#include <string>
+#include <string_view>
 
 #include <gtest/gtest.h>
+#include <unicode/uchar.h>
+#include <unicode/unistr.h>
 
 namespace {
 
-TEST(HostText, BreakableSpaces) {
-    const std::set<unsigned> blanks = {
-        0x09,   0x0A,   0x0B,   0x0C,   0x0D,   0x20,   0x85,   0x1680, 0x2000, 0x2001, 0x2002,
-        0x2003, 0x2004, 0x2005, 0x2006, 0x2008, 0x2009, 0x200A, 0x2028, 0x2029, 0x205F, 0x3000};
-    for (unsigned unit = 0; unit <= 0xFFFF; ++unit) {
-        EXPECT_EQ(qzu_isbreakablespace(static_cast<char16_t>(unit)), blanks.contains(unit)) << unit;
-    }
+std::u16string utf16(const icu::UnicodeString& text) {
+    return {text.getBuffer(), static_cast<std::size_t>(text.length())};
 }
 
-std::u16string utf16(char32_t character) {
-    if (character < 0x10000) return std::u16string(1, static_cast<char16_t>(character));
-    const char32_t rest = character - 0x10000;
-    return {static_cast<char16_t>(0xD800 + (rest >> 10)),
-            static_cast<char16_t>(0xDC00 + (rest & 0x3FF))};
+std::u16string widened(std::string_view bytes) {
+    return vxTextFromNarrow(bytes.data(), bytes.size());
+}
+
+TEST(HostText, BreakableSpaces) {
+    for (char32_t unit = 0; unit <= 0xFFFF; ++unit) {
+        const bool isNoBreak = unit == 0xA0 || unit == 0x2007 || unit == 0x202F;
+        EXPECT_EQ(qzu_isbreakablespace(static_cast<char16_t>(unit)),
+                  u_isUWhiteSpace(static_cast<UChar32>(unit)) && !isNoBreak)
+            << std::uint32_t{unit};
+    }
 }
 
 TEST(HostText, EveryCharacterReturns) {
-    for (char32_t character = 0; character <= 0x10FFFF; ++character) {
-        const std::u16string wide = utf16(character);
-        const bool surrogate = character >= 0xD800 && character <= 0xDFFF;
-        const std::string narrow = vxTextToNarrow(wide.data(), wide.size());
-        const std::u16string again = vxTextFromNarrow(narrow.data(), narrow.size());
-        ASSERT_TRUE(again == (surrogate ? u"\uFFFD" : wide)) << std::uint32_t{character};
+    for (UChar32 character = 0; character <= 0x10FFFF; ++character) {
+        const icu::UnicodeString text(character);
+        std::string bytes;
+        text.toUTF8String(bytes);
+        const std::u16string wide = utf16(text);
+        ASSERT_EQ(vxTextToNarrow(wide.data(), wide.size()), bytes) << character;
+        ASSERT_TRUE(widened(bytes) == (U_IS_SURROGATE(character) ? u"\uFFFD" : wide)) << character;
     }
 }
 
+// Every text of four bytes at the borders of what each place of a character allows.
 TEST(HostText, MalformedBytesAreSubstituted) {
-    const struct {
-        int line;
-        std::string bytes;
-        std::u16string text;
-    } rows[] = {
-        {__LINE__, "", u""},
-        {__LINE__, "a\x80z", u"a\uFFFDz"},
-        {__LINE__, "\xC3", u"\uFFFD"},
-        {__LINE__, "\xE2\x82z", u"\uFFFDz"},
-        {__LINE__, "\xC0\x80", u"\uFFFD\uFFFD"},
-        {__LINE__, "\xFF\xF4\x90", u"\uFFFD\uFFFD\uFFFD"},
-        {__LINE__, std::string("a\0b", 3), std::u16string(u"a\0b", 3)},
-    };
-    for (const auto& row : rows) {
-        SCOPED_TRACE(row.line);
-        EXPECT_TRUE(vxTextFromNarrow(row.bytes.data(), row.bytes.size()) == row.text);
+    const std::string_view borders("\0a\x80\x8F\x90\x9F\xA0\xBF\xC1\xC2\xE0\xED\xF0\xF4\xF5\xFF",
+                                   16);
+    for (std::size_t code = 0; code < 16 * 16 * 16 * 16; ++code) {
+        const char bytes[] = {borders[code >> 12], borders[code >> 8 & 15], borders[code >> 4 & 15],
+                              borders[code & 15]};
+        const auto text = icu::UnicodeString::fromUTF8(icu::StringPiece(bytes, sizeof bytes));
+        ASSERT_TRUE(widened({bytes, sizeof bytes}) == utf16(text)) << std::hex << code;
     }
+    EXPECT_TRUE(widened("").empty());
 }
 
 TEST(HostText, WidensAsciiOnly) {
     for (int byte = 0; byte < 256; ++byte) {
         const char text[] = {'a', static_cast<char>(byte), 'b'};
-        char16_t wide[3];
+        char16_t wide[3] = {};
         EXPECT_EQ(vxTextWidenAscii(text, 3, wide), byte < 0x80);
-        if (byte < 0x80) {
-            EXPECT_EQ(wide[1], byte);
-        }
+        EXPECT_TRUE(byte >= 0x80 || wide[1] == byte) << byte;
     }
 }
 
 TEST(HostText, CanonicalEncodingNames) {
     const char* const rows[][2] = {
-        {"UTF-8", "UTF-8"},           {"utf8", "UTF-8"},
-        {"ISO-8859-1", "ISO-8859-1"}, {"latin1", "ISO-8859-1"},
-        {"US-ASCII", "US-ASCII"},     {"ibm-5348_P100-1997", "windows-1252"},
-        {"UTF-16", "UTF-16"},         {"ibm-943_P15A-2003", "Shift_JIS"},
-        {"no such", "no such"},
-    };
+        {"utf8", "UTF-8"},    {"latin1", "ISO-8859-1"}, {"ibm-5348_P100-1997", "windows-1252"},
+        {"UTF-16", "UTF-16"}, {"no such", "no such"},   {"ibm-943_P15A-2003", "Shift_JIS"}};
     for (const auto& row : rows)
         EXPECT_EQ(vxTextCanonicalEncodingName(row[0]), row[1]);
 }
 
-TEST(HostDataSizes, Formats) {
-    const struct {
-        const char* name;
-        int byteOrder;
-    } formats[] = {{"little-endian", 0},  {"big-endian", 1}, {nullptr, 0},
-                   {nullptr, 0},          {nullptr, 0},      {"little-endian.l64", 0},
-                   {"big-endian.l64", 1}, {nullptr, 0}};
-    ASSERT_EQ(vxDataSizeCount(), 8);
-    EXPECT_EQ(vxDataSizeNative(), 0);
-    for (int index = 0; index < 8; ++index) {
-        EXPECT_STREQ(vxDataSizeName(index), formats[index].name);
-        EXPECT_EQ(vxDataSizeEndian(index), formats[index].byteOrder);
+std::string described(double value, std::size_t consumed) {
+    char text[40];
+    std::snprintf(text, sizeof text, "%a in %zu", value, consumed);
+    return std::isnan(value) ? "nan in " + std::to_string(consumed) : text;
+}
+
+std::string readNumber(const std::string& text, std::size_t count) {
+    std::size_t consumed = 99;
+    const double value = vxTextToDouble(text.data(), count, &consumed);
+    return described(value, consumed);
+}
+
+std::string readByTheCLibrary(const std::string& text) {
+    char* end = nullptr;
+    const double value = std::strtod(text.c_str(), &end);
+    return described(value, static_cast<std::size_t>(end - text.c_str()));
+}
+
+// Every text of six characters, and the beginnings of some longer ones.
+TEST(NumberSyntax, IsThatOfTheCLibrary) {
+    for (unsigned code = 0; code < 7 * 7 * 7 * 7 * 7 * 7; ++code) {
+        std::string text;
+        for (unsigned rest = code; text.size() < 6; rest /= 7)
+            text += "+-.05e,"[rest % 7];
+        ASSERT_EQ(readNumber(text, 6), readByTheCLibrary(text)) << text;
     }
-    for (const int outside : {-1, 8}) {
-        EXPECT_EQ(vxDataSizeName(outside), nullptr);
-        EXPECT_EQ(vxDataSizeConverted(outside, 12), 0);
+    for (const std::string text :
+         {"-INFINITYx", "+Infinity", "NaN", "1e309", "-1e99999999999999999999", "1E-400", "0.1x",
+          "1e-99999999999999999999", "1234567890e300", "0.00000000001e-320", "4.9e-324"}) {
+        for (std::size_t count = 0; count <= text.size(); ++count)
+            EXPECT_EQ(readNumber(text, count), readByTheCLibrary(text.substr(0, count))) << text;
     }
-    const int bytes[] = {0, 1, 2, 1, 2, 4, 8, 1, 2, 4, 8, 4, 8, 0};
-    for (int type = 0; type <= 13; ++type)
-        EXPECT_EQ(vxDataSizeConverted(1, type), bytes[type]);
+}
+
+TEST(NumberSyntax, LeavesOutWhatOnlyTheCLibraryKnows) {
+    EXPECT_EQ(readNumber(" 5", 2), described(0, 0));
+    EXPECT_EQ(readNumber("0x10", 4), described(0, 1));
+    EXPECT_EQ(readNumber("nan(1)", 6), described(NAN, 3));
 }
 
 }  // namespace
