@@ -32,9 +32,9 @@ bool isProgramCommand(const transcript::Case& example) {
 void registerCase(const transcript::Case& example, const std::string& program) {
     const std::string suite = std::filesystem::path(example.file).stem().string();
     const std::string name = "line" + std::to_string(example.line);
-    testing::RegisterTest(
-        suite.c_str(), name.c_str(), nullptr, nullptr, example.file.c_str(), example.line,
-        [example, program]() -> testing::Test* { return new TranscriptTest(example, program); });
+    const auto make = [example, program] { return new TranscriptTest(example, program); };
+    testing::RegisterTest(suite.c_str(), name.c_str(), nullptr, nullptr, example.file.c_str(),
+                          example.line, make);
 }
 
 }  // namespace

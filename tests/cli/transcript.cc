@@ -13,21 +13,6 @@ namespace {
 
 namespace fs = std::filesystem;
 
-// Removed with everything in it.
-class Directory {
-public:
-    Directory() {
-        std::string name = fs::temp_directory_path() / "fileio-cli-XXXXXX";
-        if (mkdtemp(name.data()) == nullptr) throw std::runtime_error("no temporary directory");
-        path = name;
-    }
-    ~Directory() { fs::remove_all(path); }
-    Directory(const Directory&) = delete;
-    Directory& operator=(const Directory&) = delete;
-
-    fs::path path;
-};
-
 std::string contents(const fs::path& path) {
     std::ifstream in(path, std::ios::binary);
     std::ostringstream text;
@@ -55,9 +40,8 @@ std::string withoutBlankEnd(std::string text) {
 std::vector<Case> read(const std::string& path) {
     std::vector<Case> cases;
     std::ifstream in(path);
-    if (!in) throw std::runtime_error("cannot read " + path);
-    bool inside = !path.ends_with(".md");
-    const bool isMarkdown = !inside;
+    const bool isMarkdown = path.ends_with(".md");
+    bool inside = !isMarkdown;
     int number = 0;
     for (std::string line; std::getline(in, line);) {
         ++number;
@@ -69,24 +53,25 @@ std::vector<Case> read(const std::string& path) {
             cases.back().expected += line + '\n';
         }
     }
-    if (cases.empty() && !isMarkdown) throw std::runtime_error("no command in " + path);
+    if (cases.empty()) throw std::runtime_error("no command in " + path);
     for (Case& example : cases)
         example.expected = withoutBlankEnd(example.expected);
     return cases;
 }
 
 std::string run(const std::string& command, const std::string& program) {
-    const Directory home;
-    const Directory captured;
-    fs::create_directory(home.path / "bin");
-    fs::create_symlink(program, home.path / "bin/fileio");
-    std::ofstream(captured.path / "script")
-        << "exec >" << captured.path << "/out 2>" << captured.path << "/err\n"
-        << "cd " << home.path << "\nPATH=\"$PWD/bin:$PATH\"\n"
-        << command << '\n';
-    const int status = std::system(("sh " + (captured.path / "script").string()).c_str());
-    std::string seen = prefixedLines(contents(captured.path / "out"), "");
-    seen += prefixedLines(contents(captured.path / "err"), "! ");
+    std::string name = fs::temp_directory_path() / "fileio-cli-XXXXXX";
+    if (mkdtemp(name.data()) == nullptr) throw std::runtime_error("no temporary directory");
+    const fs::path folder = name;
+    fs::create_directories(folder / "home/bin");
+    fs::create_symlink(program, folder / "home/bin/fileio");
+    std::ofstream(folder / "script") << "cd " << folder << "\nexec >out 2>err\ncd home\n"
+                                     << "PATH=\"$PWD/bin:$PATH\"\n"
+                                     << command << '\n';
+    const int status = std::system(("sh " + (folder / "script").string()).c_str());
+    std::string seen = prefixedLines(contents(folder / "out"), "");
+    seen += prefixedLines(contents(folder / "err"), "! ");
+    fs::remove_all(folder);
     const int exitStatus = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
     if (exitStatus != 0) seen += '[' + std::to_string(exitStatus) + "]\n";
     return withoutBlankEnd(seen);
