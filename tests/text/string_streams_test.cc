@@ -80,7 +80,8 @@ TEST(OutputStreams, PrintWhateverTheirSizeWasSaidToBe) {
     outputStringStream string("");
     for (const int width : {1, 7, 8, 9, 511, 512, 513, 70000}) {
         for (const unsigned long promised : {0UL, ~0UL}) {
-            const std::string expected = std::string(std::max(width - 2, 0), ' ') + "7.12";
+            const std::string expected =
+                std::string(static_cast<std::size_t>(std::max(width - 2, 0)), ' ') + "7.12";
             outputStringStream stream("UTF-8");
             console.text.clear();
             for (TcodnStream* out :
