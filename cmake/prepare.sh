@@ -33,6 +33,7 @@ install_missing() {
 
 build_packages=(g++ cmake ninja-build libboost-dev libicu-dev rapidjson-dev)
 test_packages=("${build_packages[@]}" libgtest-dev clang binutils)
+bench_packages=("${build_packages[@]}" libfmt-dev python3-numpy)
 
 # build_preset PRESET [TARGET...]: configures once, then builds.
 build_preset() {
