@@ -195,7 +195,7 @@ std::size_t OutputBuffer::bytesOf(std::size_t elements) const {
 
 // By what the chunk really holds: the current capacity may have been set since.
 bool OutputBuffer::fitsLastChunk(std::size_t n) const {
-    return !chunks.empty() && n <= lastChunkRoom - chunkCounts.back();
+    return !chunks.empty() && n <= getFreeRoom();
 }
 
 // One more entry can then be added without an error.

@@ -39,6 +39,10 @@ public:
     void SetLastChunkSize(std::size_t actual);
 
     std::size_t GetSize() const;
+    // The elements that can still be allocated without new memory.
+    std::size_t getFreeRoom() const {
+        return chunks.empty() ? 0 : lastChunkRoom - chunkCounts.back();
+    }
     std::size_t GetTypeSize() const { return typeSize; }
     vxClassID GetClassID() const { return classID; }
     std::size_t GetCurrentCapacity() const { return currentCapacity; }

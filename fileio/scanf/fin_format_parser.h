@@ -37,6 +37,13 @@ public:
     // Piece `index`. Status 0, or 45 and null when there is none.
     finFormatPiece* fiPkGetScanFormatPiece(std::size_t index, int& status);
 
+    // Goes on as if the pieces before `index` had been handed out, in a new round when `wrapped`.
+    void goOnWith(std::size_t index, bool wrapped) {
+        nextIndex = index;
+        recycled = recycled || wrapped;
+    }
+
+    TcodnStream* getInput() const { return input; }
     std::size_t getPieceCount() const { return pieces.size(); }
     std::size_t getNextIndex() const { return nextIndex; }
     // Whether the pieces have been handed out more than once.

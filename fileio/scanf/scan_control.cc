@@ -1,6 +1,18 @@
 #include "fileio/scanf/scan_control.h"
 
+#include "fileio/scanf/scan_program.h"
+
+#include <algorithm>
+#include <optional>
+#include <typeinfo>
+
 namespace Orvandeil::FileIO {
+namespace {
+
+// So few values do not repay a program.
+[[maybe_unused]] constexpr unsigned long fewValues = 4;
+
+}  // namespace
 
 scanControl::scanControl(unsigned long valuesWanted, bool toTheEnd, unsigned long& valueCount,
                          TcodnStream& readFrom, finFormatParser& formatParser, OutputBuffer& result)
@@ -40,7 +52,16 @@ bool scanControl::performMainScan() {
     bool wrapped = false;
     unsigned long idle = 0;  // conversions that went well while there was no value yet
     const bool unlimitedAtStart = unlimited;
-    while (*count < limit || unlimited) {
+    [[maybe_unused]] std::optional<detail::ScanProgram> program;
+    while (isWanting()) {
+#ifdef FILEIO_FAST_PATHS
+        if (*count > fewValues && typeid(*this) == typeid(scanControl)) {
+            if (!program) program.emplace(*parser, *input);
+            runProgram(*program);
+            wrapped = parser->isRecycled();
+            if (!isWanting()) break;
+        }
+#endif
         if (!takePiece()) return wrapped;
         if (parser->isRecycled()) {
             wrapped = true;
@@ -55,6 +76,25 @@ bool scanControl::performMainScan() {
     performTrailingLiterals();
     return true;
 }
+
+#ifdef FILEIO_FAST_PATHS
+// Into memory that is there: a piece asks for more, so that it alone fails for want of it.
+void scanControl::runProgram(const detail::ScanProgram& program) {
+    std::size_t room = buffer->getFreeRoom();
+    if (!unlimited) room = std::min(room, limit - *count);
+    if (room == 0) return;
+    auto* const values = static_cast<char*>(buffer->Allocate(room));
+    const detail::ScanProgram::Run run = program.run(parser->getNextIndex(), values, room);
+    buffer->SetLastChunkSize(run.values);
+    if (run.pieces == 0) return;
+    *count += run.values;
+    conversions += run.pieces;
+    error = 0;
+    parser->goOnWith(run.nextPiece, run.recycled);
+    int status = 0;
+    piece = parser->fiPkGetScanFormatPiece(run.nextPiece - 1, status);
+}
+#endif
 
 // Text behind the last value belongs to it, up to the end of the format.
 void scanControl::performTrailingLiterals() {

@@ -5,6 +5,10 @@
 
 namespace Orvandeil::FileIO {
 
+namespace detail {
+class ScanProgram;
+}
+
 // Runs an input format over a stream, as often as its data last, until the values asked for are
 // stored, the data end, the input does not match, or the format stores nothing at all.
 class FILEIO_API scanControl {
@@ -38,7 +42,9 @@ public:
 private:
     friend struct LayoutProbe;
 
+    bool isWanting() const { return *count < limit || unlimited; }
     bool takePiece();
+    void runProgram(const detail::ScanProgram& program);
     void performTrailingLiterals();
 
     unsigned long limit;

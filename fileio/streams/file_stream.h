@@ -2,6 +2,7 @@
 
 #include "fileio/buffers/output_buffer.h"
 #include "fileio/export.h"
+#include "fileio/streams/file_read_buffer.h"
 #include "fileio/streams/recent_bytes.h"
 #include "fileio/text/tcodn_stream.h"
 
@@ -10,6 +11,7 @@
 #include <cstdio>
 #include <memory>
 #include <string>
+#include <string_view>
 
 namespace Orvandeil::FileIO {
 
@@ -68,6 +70,11 @@ public:
     long scanInteger(long width, int& status) override;
     long scanIntegerCouldBeHex(long width, int& status) override;
     double scanFloat(long width, int& status) override;
+
+    // For scans in place: the next bytes, as far as the file has been read, and taking those before
+    // `next` as numbers.
+    std::string_view bytesToScan() const { return detail::bytesReadAhead(file); }
+    void takeScanned(const char* next);
 
     // "UTF-8" when the file is empty, too large for detection (see DetectedCharSet), cannot be
     // opened a second time or has nothing from `startOffset` on; else the host's answer for its

@@ -213,6 +213,11 @@ void fileStream::beginScan() {
     recentBytes.clear();
 }
 
+void fileStream::takeScanned(const char* next) {
+    beginScan();
+    detail::takeReadAhead(file, next);
+}
+
 IntegerField fileStream::scanField(const IntegerScan& operation, long width, int& status) {
     beginScan();
     IntegerCollector collector(file, operation, width);

@@ -48,6 +48,10 @@ public:
     double scanFloat(long width, int& status) override;
     std::string DetectCharset(unsigned long startOffset) const override;
 
+    // For scans in place: what is left of the text, and taking the bytes before `next`.
+    std::string_view bytesToScan() const { return {current, end}; }
+    void takeScanned(const char* next) { current = next; }
+
     // The UTF-16 units, both halves of a pair counted, that the bytes read so far decode to. Takes
     // time in proportion to them.
     virtual unsigned long getUTF16Position();

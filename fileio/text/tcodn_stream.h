@@ -65,6 +65,9 @@ public:
     // PutString of `n` ASCII bytes; a byte above 0x7F writes nothing and returns 0.
     int PutASCIIString(const char* text, int n);
 
+    // Whether ASCII bytes that come next are decoded to themselves, without a converter.
+    bool readsAsciiAsIs() const { return asciiSoFar || (asciiTransparent && !midCharacter); }
+
 protected:
     // Derives latinFixed and utf16 from ICU's own name of the converter.
     void SetEncodingSpecificFlags();

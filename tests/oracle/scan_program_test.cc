@@ -1,0 +1,113 @@
+#include "fileio/scanf/scan_control.h"
+#include "fileio/text/input_string_stream.h"
+#include "tests/oracle/scan_oracle.h"
+#include "tests/support/arrays.h"
+#include "tests/support/printing.h"
+#include "tests/support/test_files.h"
+
+#include <cerrno>
+
+#include <gtest/gtest.h>
+
+namespace {
+
+using namespace Orvandeil::FileIO;
+using namespace std::string_literals;
+
+// The driver of a derived class runs piece by piece.
+struct PlainControl : scanControl {
+    using scanControl::scanControl;
+};
+
+const std::string formats[] = {"%d",     "%d,%d",        "%f",       "%hd %hu,%u",  "%ld",
+                               "%lu",    "%lu%ld",       "%f;%hf\n", "a %d , b%fc", "%d%%%f",
+                               "%d%*f",  "%*d %u",       "%f%*[,;]", "%3d%f",       "%d%s",
+                               "%i %d ", "x%*f y%*dz%d", "%hf\t%ld", "%d\u00E9%f",  "%f\u2003%d"};
+const std::string encodings[] = {"", "UTF-8", "ISO-8859-1", "Shift_JIS", "UTF-16LE"};
+
+// Text that a format reads well, with a fault now and then.
+class Inputs : public oracle::Fields {
+public:
+    using Fields::Fields;
+
+    std::string text(const std::string& format, std::size_t rounds) {
+        std::string result;
+        const std::size_t faults = 20 + below(200);
+        for (; rounds != 0; --rounds) {
+            for (std::size_t i = 0; i < format.size(); ++i) {
+                if (below(faults) == 0) result += Fields::text(1);
+                if (below(4) == 0) result += " \n\t\v\0"[below(5)];
+                if (format[i] == '%' && format[++i] != '%') {
+                    i = format.find_first_of("dufis]", i);
+                    result += number();
+                } else {
+                    result += format[i];
+                }
+            }
+        }
+        return result;
+    }
+
+private:
+    std::string number() {
+        std::string result = std::to_string(1 + below(9));
+        for (std::size_t n = below(below(6) == 0 ? 30 : 9); n != 0; --n)
+            result += static_cast<char>('0' + below(10));
+        if (below(3) == 0) result.insert(below(result.size() + 1), ".");
+        if (below(12) == 0) result += "e" + std::to_string(static_cast<long>(below(700)) - 350);
+        if (below(3) == 0) result.insert(0, below(3) == 0 ? "+" : "-");
+        return result + " "s.substr(below(2));
+    }
+};
+
+// Scans, steps back, and tells all that shows of it.
+template <class Control>
+std::string scanBy(TcodnStream& stream, const std::string& format, long limit, unsigned long back) {
+    const std::u16string text = fileio_tests::toUtf16(format);
+    finFormatParser parser(text.c_str(), &stream);
+    parser.InitFormatPieces();
+    OutputBuffer buffer(parser.getResultClass(), 4, 4, 64);
+    unsigned long count = 0;
+    Control control(static_cast<unsigned long>(limit), limit < 0, count, stream, parser, buffer);
+    const bool result = control.performMainScan();
+    const auto size = buffer.GetSize();
+    std::string seen = support::listed(buffer.GetClassID(), buffer.Transfer().get(), size);
+    long position = -1;
+    for (const long number :
+         {long{result}, static_cast<long>(count), long{control.getError()},
+          static_cast<long>(control.getConversions()), static_cast<long>(parser.getNextIndex()),
+          long{parser.isRecycled()}, long{stream.EndOfData()}, long{stream.getErrorCode()},
+          long{stream.getPosition(position)}, position, long{stream.Rewind(back)}})
+        seen += ' ' + std::to_string(number);
+    char rest[64] = {};
+    return seen + ' ' + std::string(rest, stream.GetNElements(sizeof rest, rest, 1));
+}
+
+TEST(ScanProgram, DoesWhatThePiecesDo) {
+    Inputs inputs(3);
+    for (int trial = 0; trial < 20000 && !HasFailure(); ++trial) {
+        const std::string& format = formats[inputs.below(std::size(formats))];
+        const std::string& encoding = encodings[inputs.below(std::size(encodings))];
+        const std::string text = inputs.text(format, inputs.below(40));
+        const long limit = static_cast<long>(inputs.below(40)) - 20;
+        const bool canSeek = inputs.below(2) == 0;
+        const std::size_t readAhead = 1 + inputs.below(300);
+        const unsigned long back = 1 + inputs.below(3);
+        const auto fromFile = [&](auto scan) {
+            support::FaultyFile file{
+                .bytes = text, .failingSeek = canSeek ? 0 : 1, .error = ESPIPE};
+            support::OpenedFile opened(file.open("r", readAhead), "r", encoding);
+            return scan(opened.stream, format, limit, back);
+        };
+        const auto fromText = [&](auto scan) {
+            inputStringStream stream(text.c_str(), std::ssize(text), encoding);
+            return scan(stream, format, limit, back);
+        };
+        EXPECT_EQ(fromFile(scanBy<scanControl>), fromFile(scanBy<PlainControl>))
+            << format << " of " << testing::PrintToString(text) << " in " << encoding;
+        EXPECT_EQ(fromText(scanBy<scanControl>), fromText(scanBy<PlainControl>))
+            << format << " of " << testing::PrintToString(text) << " in " << encoding;
+    }
+}
+
+}  // namespace
