@@ -35,8 +35,9 @@ public:
         const std::size_t faults = 20 + below(200);
         for (; rounds != 0; --rounds) {
             for (std::size_t i = 0; i < format.size(); ++i) {
-                if (below(faults) == 0) result += Fields::text(1);
-                if (below(4) == 0) result += " \n\t\v\0"[below(5)];
+                if (below(faults) == 0) result += below(2) == 0 ? "\0"s : Fields::text(1);
+                if ((format[i] == '%' || format[i] == ' ') && below(4) == 0)
+                    result += " \n\t\v"[below(4)];
                 if (format[i] == '%' && format[++i] != '%') {
                     i = format.find_first_of("dufis]", i);
                     result += number();
@@ -89,9 +90,9 @@ TEST(ScanProgram, DoesWhatThePiecesDo) {
         const std::string& format = formats[inputs.below(std::size(formats))];
         const std::string& encoding = encodings[inputs.below(std::size(encodings))];
         const std::string text = inputs.text(format, inputs.below(40));
-        const long limit = static_cast<long>(inputs.below(40)) - 20;
+        const long limit = inputs.below(3) == 0 ? -1 : static_cast<long>(inputs.below(20));
         const bool canSeek = inputs.below(2) == 0;
-        const std::size_t readAhead = 1 + inputs.below(300);
+        const std::size_t readAhead = 1 + inputs.below(60);
         const unsigned long back = 1 + inputs.below(3);
         const auto fromFile = [&](auto scan) {
             support::FaultyFile file{
