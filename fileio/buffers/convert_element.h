@@ -132,6 +132,8 @@ template <class To, class From>
 inline To convertElement(From value) {
     if constexpr (std::is_same_v<To, From>) {
         return value;
+    } else if constexpr (std::is_floating_point_v<To> && std::is_same_v<From, Logical>) {
+        return toNumber(value) != 0 ? To{1} : To{0};
     } else if constexpr (std::is_floating_point_v<To>) {
         return static_cast<To>(toNumber(value));
     } else if constexpr (std::is_floating_point_v<From>) {

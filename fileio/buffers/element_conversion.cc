@@ -3,6 +3,7 @@
 #include "fileio/buffers/convert_element.h"
 #include "fileio/buffers/host_array.h"
 #include "fileio/buffers/output_buffer.h"
+#include "fileio/buffers/vector_unit.h"
 #include "fileio/host/data_sizes.h"
 
 #include <algorithm>
@@ -49,8 +50,10 @@ const TypeEntry& findType(Key TypeEntry::*key, Key wanted, const TypeEntry& fall
 // Converts a run of `count` elements and returns the place behind the last one written.
 using ConvertRun = void* (*)(void* target, const void* source, std::size_t count);
 
+// The loop for one pair of classes. That the blocks do not overlap lets it be vectorised.
 template <class To, class From>
-void* convertRun(void* target, const void* source, std::size_t count) {
+[[gnu::always_inline]] inline void* convertElements(void* target, const void* source,
+                                                    std::size_t count) {
     char* __restrict to = static_cast<char*>(target);
     const char* __restrict from = static_cast<const char*>(source);
     if constexpr (std::is_same_v<To, From>) {
@@ -64,42 +67,76 @@ void* convertRun(void* target, const void* source, std::size_t count) {
     return to + count * sizeof(To);
 }
 
+// The loops for one kind of processor each.
+struct AnyProcessor {
+    template <class To, class From>
+    static void* run(void* target, const void* source, std::size_t count) {
+        return convertElements<To, From>(target, source, count);
+    }
+};
+#ifdef FILEIO_VECTOR_UNITS
+struct Avx2Processor {
+    template <class To, class From>
+    FILEIO_FOR_AVX2 static void* run(void* target, const void* source, std::size_t count) {
+        return convertElements<To, From>(target, source, count);
+    }
+};
+struct Avx512Processor {
+    template <class To, class From>
+    FILEIO_FOR_AVX512 static void* run(void* target, const void* source, std::size_t count) {
+        return convertElements<To, From>(target, source, count);
+    }
+};
+#endif
+
 constexpr std::size_t classCount = detail::lastElementClass - detail::firstElementClass + 1;
 
 constexpr std::size_t classIndex(int classID) {
     return static_cast<std::size_t>(classID - detail::firstElementClass);
 }
 
-template <std::size_t target, std::size_t source>
+template <class Processor, std::size_t target, std::size_t source>
 constexpr ConvertRun runOf() {
     using To = typename ElementOf<detail::firstElementClass + static_cast<int>(target)>::type;
     using From = typename ElementOf<detail::firstElementClass + static_cast<int>(source)>::type;
     if constexpr (std::is_void_v<To> || std::is_void_v<From>) {
         return nullptr;
     } else {
-        return &convertRun<To, From>;
+        return &Processor::template run<To, From>;
     }
 }
 
 using RunsFromClass = std::array<ConvertRun, classCount>;
 
-template <std::size_t target, std::size_t... sources>
+using Runs = std::array<RunsFromClass, classCount>;
+
+template <class Processor, std::size_t target, std::size_t... sources>
 constexpr RunsFromClass runsInto(std::index_sequence<sources...>) {
-    return {runOf<target, sources>()...};
+    return {runOf<Processor, target, sources>()...};
 }
 
-template <std::size_t... targets>
-constexpr std::array<RunsFromClass, classCount> makeRuns(std::index_sequence<targets...>) {
-    return {runsInto<targets>(std::make_index_sequence<classCount>())...};
+template <class Processor, std::size_t... targets>
+constexpr Runs makeRuns(std::index_sequence<targets...>) {
+    return {runsInto<Processor, targets>(std::make_index_sequence<classCount>())...};
 }
 
 // By target class, then by source class.
-constexpr auto runs = makeRuns(std::make_index_sequence<classCount>());
+template <class Processor>
+constexpr Runs runsOn = makeRuns<Processor>(std::make_index_sequence<classCount>());
 
-ConvertRun findRun(vxClassID target, vxClassID source) {
+const Runs& runsFor([[maybe_unused]] std::size_t count) {
+#ifdef FILEIO_VECTOR_UNITS
+    constexpr std::size_t leastForVectors = 16;
+    if (count >= leastForVectors && detail::hasAvx512()) return runsOn<Avx512Processor>;
+    if (count >= leastForVectors && detail::hasAvx2()) return runsOn<Avx2Processor>;
+#endif
+    return runsOn<AnyProcessor>;
+}
+
+ConvertRun findRun(vxClassID target, vxClassID source, std::size_t count) {
     const std::size_t to = classIndex(target);
     const std::size_t from = classIndex(source);
-    return to < classCount && from < classCount ? runs[to][from] : nullptr;
+    return to < classCount && from < classCount ? runsFor(count)[to][from] : nullptr;
 }
 
 }  // namespace
@@ -141,7 +178,7 @@ vxArray* fiPkString2DoubleRowMatrix(const char* text) {
 
 void* AssignToVoidBuffer(vxClassID targetClass, void* target, vxClassID sourceClass,
                          const void* source, std::size_t count) {
-    const ConvertRun run = findRun(targetClass, sourceClass);
+    const ConvertRun run = findRun(targetClass, sourceClass, count);
     return run == nullptr ? nullptr : run(target, source, count);
 }
 

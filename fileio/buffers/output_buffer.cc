@@ -1,5 +1,6 @@
 #include "fileio/buffers/output_buffer.h"
 
+#include "fileio/buffers/byte_order.h"
 #include "fileio/buffers/element_conversion.h"
 #include "fileio/constants.h"
 #include "fileio/errors/identifiers.h"
@@ -9,33 +10,12 @@
 #include <algorithm>
 #include <bit>
 #include <cstdint>
-#include <cstring>
 #include <limits>
 #include <new>
 #include <numeric>
 
 namespace Orvandeil::FileIO {
 namespace {
-
-std::uint16_t swapBytes(std::uint16_t value) {
-    return __builtin_bswap16(value);
-}
-std::uint32_t swapBytes(std::uint32_t value) {
-    return __builtin_bswap32(value);
-}
-std::uint64_t swapBytes(std::uint64_t value) {
-    return __builtin_bswap64(value);
-}
-
-template <class Unsigned>
-void flipRun(char* elements, std::size_t count) {
-    for (std::size_t i = 0; i < count; ++i) {
-        Unsigned value;
-        std::memcpy(&value, elements + i * sizeof value, sizeof value);
-        value = swapBytes(value);
-        std::memcpy(elements + i * sizeof value, &value, sizeof value);
-    }
-}
 
 // The class that holds values of an integer type, by its size and sign.
 template <class Integer>
@@ -123,9 +103,7 @@ void OutputBuffer::SetNextAfterLastElement() {
 
 void OutputBuffer::FlipBytes() {
     for (std::size_t i = 0; i < chunks.size(); ++i) {
-        if (typeSize == 2) flipRun<std::uint16_t>(chunks[i], chunkCounts[i]);
-        if (typeSize == 4) flipRun<std::uint32_t>(chunks[i], chunkCounts[i]);
-        if (typeSize == 8) flipRun<std::uint64_t>(chunks[i], chunkCounts[i]);
+        detail::flipElements(chunks[i], typeSize, chunkCounts[i]);
     }
     SetNextAfterLastElement();
 }
