@@ -9,6 +9,8 @@ namespace Orvandeil::FileIO::constants {
 #ifdef FILEIO_SMALL_CONSTANTS
 // Bytes moved by one standard-library read or write.
 inline constexpr std::size_t transferPieceBytes = 64;
+// Bytes of elements that are swapped and converted while they stay in the processor's cache.
+inline constexpr std::size_t conversionPieceBytes = 32;
 // Bytes decoded, and UTF-16 bytes encoded, by one converter call.
 inline constexpr std::size_t converterPieceBytes = 48;
 // First block of a string output stream, in bytes. Callers may rely on it, so it never shrinks.
@@ -23,6 +25,7 @@ inline constexpr std::size_t paddingBlockUnits = 3;
 inline constexpr std::size_t reservedChunkBytes = 16;
 #else
 inline constexpr std::size_t transferPieceBytes = 1048576;
+inline constexpr std::size_t conversionPieceBytes = 65536;
 inline constexpr std::size_t converterPieceBytes = 0x3FFFFFFF;
 inline constexpr std::size_t firstOutputBlockBytes = 1024;
 inline constexpr std::size_t numberScratchBytes = 512;

@@ -2,7 +2,7 @@
 
 #include "embedded/builtins/bit_transfer.h"
 #include "embedded/builtins/file_element.h"
-#include "embedded/builtins/strided_read.h"
+#include "embedded/builtins/piecewise_read.h"
 #include "fileio/buffers/element_conversion.h"
 #include "fileio/buffers/output_buffer.h"
 #include "fileio/constants.h"
@@ -47,19 +47,21 @@ void readPast(fileStream& stream, unsigned long bytes) {
 }
 
 // One read: blocks of elements with a skip between them, all in one block when nothing is skipped.
+// Elements are collected as they are in the file; those of the fast part are converted already.
 class Reader {
 public:
     Reader(OpenFile& source, const FileElement& fileElement, const ReadAttributes& attributes,
-           unsigned long count, OutputBuffer& target)
+           unsigned long count, OutputBuffer& converted, OutputBuffer& collected)
         : file(source),
           element(fileElement),
           skip(attributes.skip.skip),
           perBlock(skip == 0 ? count : attributes.precision.repeatCount),
           wanted(count),
-          buffer(target) {}
+          target(converted),
+          buffer(collected) {}
 
     std::optional<Failure> run() {
-        unsigned long total = gather();
+        unsigned long total = readFastPart();
         while (total < wanted) {
             const unsigned long count = std::min(perBlock, wanted - total);
             const unsigned long got = readBlock(count);
@@ -71,14 +73,11 @@ public:
     }
 
 private:
-    // The fast part of a strided read; it leaves at least one block.
-    unsigned long gather() {
+    unsigned long readFastPart() {
 #ifdef FILEIO_FAST_PATHS
-        if (skip == 0 || element.form != FileElement::Plain || wanted == 0) return 0;
-        const unsigned long blocks = (wanted - 1) / perBlock;
-        return perBlock * gatherBlocks(file,
-                                       {element.bytes, perBlock, static_cast<unsigned long>(skip)},
-                                       blocks, buffer);
+        const auto skipped = static_cast<unsigned long>(skip);
+        return readInPieces(file, {element, wanted, perBlock, skipped, buffer.GetClassID()},
+                            target);
 #else
         return 0;
 #endif
@@ -115,6 +114,7 @@ private:
     long skip;
     unsigned long perBlock;
     unsigned long wanted;
+    OutputBuffer& target;
     OutputBuffer& buffer;
 };
 
@@ -124,9 +124,9 @@ unsigned long countOf(const SizeAttribute& size) {
     return size.isInfinite || tooMany ? everything : count;
 }
 
-ArrayPtr deliver(OutputBuffer& collected, vxClassID classID, const SizeAttribute& size) {
-    if (collected.GetClassID() == classID) return ArrayPtr(collected.TransferArray(size, false));
-    OutputBuffer converted(classID, 1, 1, 1);
+ArrayPtr deliver(OutputBuffer& converted, OutputBuffer& collected, const SizeAttribute& size) {
+    const bool isSame = collected.GetClassID() == converted.GetClassID();
+    if (isSame && converted.GetSize() == 0) return ArrayPtr(collected.TransferArray(size, false));
     converted.AppendBuffer(collected);
     return ArrayPtr(converted.TransferArray(size, false));
 }
@@ -142,12 +142,13 @@ ReadResult readBinary(OpenFile& file, const ReadAttributes& attributes) {
     beginElements(file, Direction::Reading, element, precision.machineFormat);
 
     const vxClassID delivered = deliveredClass(precision);
+    OutputBuffer converted(delivered, 1, 1, 1);
     OutputBuffer collected(collectedClass(element, delivered), usualChunk, 1, largestChunk);
     ReadResult result;
-    result.failure = Reader(file, element, attributes, countOf(size), collected).run();
-    result.count = collected.GetSize();
+    result.failure = Reader(file, element, attributes, countOf(size), converted, collected).run();
+    result.count = converted.GetSize() + collected.GetSize();
     if (element.needsFlip) collected.FlipBytes();
-    result.array = deliver(collected, delivered, size);
+    result.array = deliver(converted, collected, size);
     return result;
 }
 

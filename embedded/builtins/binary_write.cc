@@ -57,7 +57,7 @@ private:
         const unsigned long atOnce =
             isNative() && element.form == FileElement::Plain
                 ? count
-                : std::max(1UL, constants::transferPieceBytes / scratch.GetTypeSize());
+                : std::max(1UL, constants::conversionPieceBytes / scratch.GetTypeSize());
         unsigned long done = 0;
         unsigned long piece = 0;
         unsigned long put = 0;

@@ -5,30 +5,35 @@
 #include "fileio/constants.h"
 
 #include <algorithm>
+#include <cstring>
 #include <type_traits>
-#include <vector>
 
 namespace Orvandeil::FileIO::embedded {
 namespace {
 
-// The bytes of a run of fields, the carry byte first and room for the last field's reach behind.
-class Run {
-public:
-    Run(const FieldLayout& fieldLayout, unsigned long count)
-        : layout(fieldLayout),
-          fieldsAtOnce(std::min(count, constants::transferPieceBytes * 8 / stride())),
-          bytes(1 + (fieldsAtOnce * stride() + 7) / 8 + fieldReach) {}
+template <bool bigEndian>
+std::uint64_t loadWord(const unsigned char* bytes) {
+    std::uint64_t word;
+    std::memcpy(&word, bytes, sizeof word);
+    return bigEndian ? __builtin_bswap64(word) : word;
+}
 
-    unsigned long stride() const { return static_cast<unsigned long>(layout.stride); }
-
-    FieldLayout layout;
-    unsigned long fieldsAtOnce;
-    std::vector<unsigned char> bytes;
-};
+// Of fields that a word reaches from any bit.
+template <class T, bool bigEndian>
+void unpackNarrow(const FieldRun& run, std::size_t place, unsigned long count, T* out) {
+    const int left = 64 - run.layout.bits;
+    for (unsigned long i = 0; i < count; ++i, place += run.stride()) {
+        const std::uint64_t word = loadWord<bigEndian>(run.bytes.data() + place / 8);
+        const int shift = static_cast<int>(place % 8);
+        // With the highest bit of the field at the top, which extends the sign.
+        const std::uint64_t top = word << (bigEndian ? shift : left - shift);
+        using Wide = std::conditional_t<std::is_signed_v<T>, std::int64_t, std::uint64_t>;
+        out[i] = static_cast<T>(static_cast<Wide>(top) >> left);
+    }
+}
 
 template <class T>
-void unpack(const Run& run, std::size_t place, unsigned long count, void* target) {
-    auto* out = static_cast<T*>(target);
+void unpackWide(const FieldRun& run, std::size_t place, unsigned long count, T* out) {
     for (unsigned long i = 0; i < count; ++i, place += run.stride()) {
         const std::uint64_t field = loadField(run.bytes.data(), place, run.layout);
         if constexpr (std::is_signed_v<T>) {
@@ -37,6 +42,15 @@ void unpack(const Run& run, std::size_t place, unsigned long count, void* target
             out[i] = static_cast<T>(field);
         }
     }
+}
+
+template <class T>
+void unpackFields(const FieldRun& run, std::size_t place, unsigned long count, void* target) {
+    constexpr int widestNarrow = 57;
+    auto* const out = static_cast<T*>(target);
+    if (run.layout.bits > widestNarrow) return unpackWide(run, place, count, out);
+    if (run.layout.bigEndian) return unpackNarrow<T, true>(run, place, count, out);
+    unpackNarrow<T, false>(run, place, count, out);
 }
 
 template <class T>
@@ -50,7 +64,7 @@ std::uint64_t saturated(T value, int bits) {
 }
 
 template <class T>
-void pack(Run& run, std::size_t place, unsigned long count, const void* source) {
+void pack(FieldRun& run, std::size_t place, unsigned long count, const void* source) {
     const auto* const values = static_cast<const T*>(source);
     for (unsigned long i = 0; i < count; ++i, place += run.stride())
         storeField(run.bytes.data(), place, run.layout, saturated(values[i], run.layout.bits));
@@ -65,7 +79,7 @@ void withIntegerType(vxClassID classID, Apply apply) {
     withElementType(classID, known, [] {});
 }
 
-void keepRest(CarryByte& carry, const Run& run, std::size_t end) {
+void keepRest(CarryByte& carry, const FieldRun& run, std::size_t end) {
     const auto used = static_cast<int>(end % 8);
     carry.pendingBits = used == 0 ? 0 : 8 - used;
     carry.carryValue = used == 0 ? 0 : bitsFrom(run.bytes[end / 8], used, run.layout.bigEndian);
@@ -76,29 +90,7 @@ void dropBits(CarryByte& carry) {
     carry.carryValue = 0;
 }
 
-// One piece of a read, in a run that has room for it.
-unsigned long readPiece(OpenFile& file, Run& run, unsigned long count, OutputBuffer& buffer) {
-    CarryByte& carry = file.carry();
-    const auto pending = static_cast<unsigned long>(carry.pendingBits);
-    const unsigned long bits = count * run.stride();
-    const unsigned long needed = bits <= pending ? 0 : (bits - pending + 7) / 8;
-    run.bytes[0] = carry.carryValue;
-    auto* const rest = reinterpret_cast<char*>(run.bytes.data() + 1);
-    const unsigned long got = needed == 0 ? 0 : file.stream->GetNElements(needed, rest, 1);
-    const unsigned long whole = std::min(count, (pending + 8 * got) / run.stride());
-    const std::size_t start = 8 - pending;
-    std::size_t room = whole;
-    void* const target = buffer.Allocate(room);
-    withIntegerType(buffer.GetClassID(), [&]<class T>() { unpack<T>(run, start, whole, target); });
-    if (whole == count) {
-        keepRest(carry, run, start + bits);
-    } else {
-        dropBits(carry);
-    }
-    return whole;
-}
-
-unsigned long writePiece(OpenFile& file, Run& run, unsigned long count, vxClassID classID,
+unsigned long writePiece(OpenFile& file, FieldRun& run, unsigned long count, vxClassID classID,
                          const void* values) {
     CarryByte& carry = file.carry();
     const auto pending = static_cast<unsigned long>(carry.pendingBits);
@@ -120,12 +112,12 @@ unsigned long writePiece(OpenFile& file, Run& run, unsigned long count, vxClassI
 
 // Calls piece(fields done, fields wanted) until `count` fields are done or one comes up short.
 template <class Piece>
-unsigned long inPieces(unsigned long count, const Run& run, Piece piece) {
+unsigned long inPieces(unsigned long count, unsigned long atOnce, Piece piece) {
     unsigned long done = 0;
     unsigned long wanted = 0;
     unsigned long moved = 0;
     while (done < count && moved == wanted) {
-        wanted = std::min(count - done, run.fieldsAtOnce);
+        wanted = std::min(count - done, atOnce);
         moved = piece(done, wanted);
         done += moved;
     }
@@ -134,19 +126,49 @@ unsigned long inPieces(unsigned long count, const Run& run, Piece piece) {
 
 }  // namespace
 
+FieldRun::FieldRun(const FieldLayout& fieldLayout, unsigned long count)
+    : layout(fieldLayout),
+      fieldsAtOnce(std::min(count, constants::transferPieceBytes * 8 / stride())),
+      bytes(1 + (fieldsAtOnce * stride() + 7) / 8 + fieldReach) {}
+
+unsigned long FieldReader::fetch(unsigned long count) {
+    CarryByte& carry = file.carry();
+    const auto pending = static_cast<unsigned long>(carry.pendingBits);
+    const unsigned long bits = count * run.stride();
+    const unsigned long needed = bits <= pending ? 0 : (bits - pending + 7) / 8;
+    run.bytes[0] = carry.carryValue;
+    auto* const rest = reinterpret_cast<char*>(run.bytes.data() + 1);
+    const unsigned long got = needed == 0 ? 0 : file.stream->GetNElements(needed, rest, 1);
+    fetched = std::min(count, (pending + 8 * got) / run.stride());
+    start = 8 - pending;
+    if (fetched == count) {
+        keepRest(carry, run, start + bits);
+    } else {
+        dropBits(carry);
+    }
+    return fetched;
+}
+
+void FieldReader::unpack(vxClassID classID, void* target) const {
+    withIntegerType(classID, [&]<class T>() { unpackFields<T>(run, start, fetched, target); });
+}
+
 unsigned long readFields(OpenFile& file, const FieldLayout& layout, unsigned long count,
                          OutputBuffer& buffer) {
-    Run run(layout, count);
-    return inPieces(count, run, [&](unsigned long, unsigned long wanted) {
-        return readPiece(file, run, wanted, buffer);
+    FieldReader reader(file, layout, count);
+    return inPieces(count, reader.fieldsAtOnce(), [&](unsigned long, unsigned long wanted) {
+        std::size_t fields = reader.fetch(wanted);
+        void* const target = buffer.Allocate(fields);
+        reader.unpack(buffer.GetClassID(), target);
+        return fields;
     });
 }
 
 unsigned long writeFields(OpenFile& file, const FieldLayout& layout, unsigned long count,
                           vxClassID classID, const void* values) {
-    Run run(layout, count);
+    FieldRun run(layout, count);
     const std::size_t size = elementBytes(classID);
-    return inPieces(count, run, [&](unsigned long done, unsigned long wanted) {
+    return inPieces(count, run.fieldsAtOnce, [&](unsigned long done, unsigned long wanted) {
         const char* const from = static_cast<const char*>(values) + done * size;
         return writePiece(file, run, wanted, classID, from);
     });

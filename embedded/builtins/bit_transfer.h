@@ -5,10 +5,43 @@
 #include "fileio/buffers/output_buffer.h"
 
 #include <cstddef>
+#include <vector>
 
 // Runs of bit fields in files. A run begins in the file's carry byte and ends in it; the transfer
 // has begun (beginBitTransfer).
 namespace Orvandeil::FileIO::embedded {
+
+// The bytes of a run of fields, the carry byte first and room for the last field's reach behind.
+struct FieldRun {
+    FieldRun(const FieldLayout& fieldLayout, unsigned long count);
+
+    unsigned long stride() const { return static_cast<unsigned long>(layout.stride); }
+
+    FieldLayout layout;
+    unsigned long fieldsAtOnce;  // `count` at most
+    std::vector<unsigned char> bytes;
+};
+
+// Reads fields in two steps, so that their number is known before there has to be room for them.
+class FieldReader {
+public:
+    // Of up to `atOnce` fields at a time.
+    FieldReader(OpenFile& source, const FieldLayout& layout, unsigned long atOnce)
+        : file(source), run(layout, atOnce) {}
+
+    unsigned long fieldsAtOnce() const { return run.fieldsAtOnce; }
+
+    // Reads `count` fields and tells how many there were.
+    unsigned long fetch(unsigned long count);
+    // Puts the fields just read into a block of elements of an integer class.
+    void unpack(vxClassID classID, void* target) const;
+
+private:
+    OpenFile& file;
+    FieldRun run;
+    unsigned long fetched = 0;
+    std::size_t start = 0;  // the bit where the first of them begins
+};
 
 // Reads up to `count` fields into a buffer of an integer class, and not a byte too many. Returns
 // the fields read; fewer at the end of the data, where the bits of an incomplete field are dropped.
