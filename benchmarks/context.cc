@@ -34,6 +34,28 @@ std::string Context::file(std::string_view name, std::string_view bytes) const {
     return where;
 }
 
+// The system's own Python, which has the system's NumPy, whatever else PATH offers.
+Interpreter& Context::python() {
+    if (!pythonPeers) {
+        pythonPeers.reset(
+            new Interpreter({"/usr/bin/python3", FILEIO_BENCHMARKS_FOLDER "/peers.py"}));
+    }
+    return *pythonPeers;
+}
+
+Interpreter& Context::r() {
+    if (!rPeers) {
+        rPeers.reset(
+            new Interpreter({"Rscript", "--vanilla", FILEIO_BENCHMARKS_FOLDER "/peers.R"}));
+    }
+    return *rPeers;
+}
+
+void Context::clear() const {
+    for (const fs::directory_entry& entry : fs::directory_iterator(folder))
+        fs::remove(entry.path());
+}
+
 std::uint64_t Random::next() {
     std::uint64_t z = state += 0x9e3779b97f4a7c15;
     z = (z ^ (z >> 30)) * 0xbf58476d1ce4e5b9;
@@ -55,6 +77,14 @@ std::vector<double> integers(std::size_t count, std::int64_t low, std::int64_t h
     std::vector<double> values(count);
     for (double& value : values)
         value = static_cast<double>(random.integer(low, high));
+    return values;
+}
+
+std::vector<double> nearIntegers(std::size_t count, std::int64_t low, std::int64_t high) {
+    Random random;
+    std::vector<double> values(count);
+    for (double& value : values)
+        value = static_cast<double>(random.integer(low, high)) + random.uniform(-0.49, 0.49);
     return values;
 }
 

@@ -1,7 +1,10 @@
 #pragma once
 
+#include "benchmarks/child.h"
+
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -24,10 +27,18 @@ public:
     std::string path(std::string_view name) const;
     // A file of these bytes there.
     std::string file(std::string_view name, std::string_view bytes) const;
+    // Removes all files.
+    void clear() const;
+
+    // Interpreters with their peers, started when they are first asked for.
+    Interpreter& python();
+    Interpreter& r();
 
 private:
     bool quick;
     std::string folder;
+    std::unique_ptr<Interpreter> pythonPeers;
+    std::unique_ptr<Interpreter> rPeers;
 };
 
 // The same numbers in every run (splitmix64).
@@ -45,6 +56,13 @@ private:
 
 std::vector<double> integers(std::size_t count, std::int64_t low, std::int64_t high);
 std::vector<double> reals(std::size_t count, double low, double high);
+// Near whole numbers on either side, and never half-way between two.
+std::vector<double> nearIntegers(std::size_t count, std::int64_t low, std::int64_t high);
+
+template <class T>
+std::vector<T> elements(const std::vector<double>& values) {
+    return {values.begin(), values.end()};
+}
 
 template <class T>
 std::string_view bytesOf(const std::vector<T>& elements) {

@@ -1,7 +1,10 @@
 #include "benchmarks/host_values.h"
 
 #include "fileio/buffers/host_block.h"
+#include "fileio/buffers/output_buffer.h"
 #include "fileio/printf/printf_controller.h"
+#include "fileio/scanf/scan_control.h"
+#include "fileio/text/input_string_stream.h"
 #include "fileio/text/output_string_stream.h"
 
 namespace bench {
@@ -22,6 +25,22 @@ void printToBlock(Trial& trial, const std::u16string& format,
     });
     trial.result(std::u16string_view(reinterpret_cast<const char16_t*>(block.get()),
                                      static_cast<std::size_t>(bytes) / sizeof(char16_t)));
+}
+
+void scanBytes(Trial& trial, const std::string& text, const std::u16string& format) {
+    constexpr std::size_t usualChunk = 1024;
+    constexpr std::size_t largestChunk = 1 << 23;
+    const ArrayPtr array = trial.time([&] {
+        inputStringStream stream(text.c_str(), static_cast<long>(text.size()), "UTF-8");
+        finFormatParser parser(format.c_str(), &stream);
+        parser.InitFormatPieces();
+        OutputBuffer values(parser.getResultClass(), usualChunk, usualChunk, largestChunk);
+        unsigned long count = 0;
+        scanControl control(0, true, count, stream, parser, values);
+        control.performMainScan();
+        return ArrayPtr(values.TransferArray());
+    });
+    resultOfArray(trial, *array);
 }
 
 void resultOfArray(Trial& trial, const vxArray& array) {

@@ -53,6 +53,10 @@ private:
     std::string bytesOfResult;
 };
 
+// For files that are about to be written: replacing the contents of one would make the file system
+// write them out at once.
+void removeFile(const std::string& path);
+
 // Keeps the compiler from dropping the work that made the memory behind it.
 inline void keep(const void* memory) {
     asm volatile("" : : "r"(memory) : "memory");
@@ -89,5 +93,9 @@ struct JobEntry {
 using JobList = std::vector<JobEntry>;
 
 void addPrintJobs(JobList& jobs);
+void addScanJobs(JobList& jobs);
+void addReadJobs(JobList& jobs);
+void addWriteJobs(JobList& jobs);
+void addConvertJobs(JobList& jobs);
 
 }  // namespace bench

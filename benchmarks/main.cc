@@ -57,6 +57,10 @@ Options parsed(int argc, char** argv) {
 JobList allJobs() {
     JobList jobs;
     addPrintJobs(jobs);
+    addScanJobs(jobs);
+    addReadJobs(jobs);
+    addWriteJobs(jobs);
+    addConvertJobs(jobs);
     return jobs;
 }
 
@@ -97,6 +101,7 @@ Rows runJobs(const JobList& jobs, Context& context, int& refused) {
             std::fprintf(stderr, "%s: %s\n", entry.name.c_str(), error.what());
             ++refused;
         }
+        context.clear();
     }
     return rows;
 }

@@ -130,6 +130,7 @@ Job makeStringJob(Context& context) {
 
 template <class Format>
 void oursToFile(Trial& trial, const PrintInput& input) {
+    removeFile(input.path);
     trial.time([&] {
         embedded::OpenRequest request;
         request.permission = "w";
@@ -144,6 +145,7 @@ void oursToFile(Trial& trial, const PrintInput& input) {
 // Opens, lets `write` write, and closes.
 template <class Write>
 void intoFile(Trial& trial, const PrintInput& input, Write write) {
+    removeFile(input.path);
     trial.time([&] {
         std::FILE* const file = std::fopen(input.path.c_str(), "w");
         write(file);
@@ -154,6 +156,7 @@ void intoFile(Trial& trial, const PrintInput& input, Write write) {
 
 template <class Format>
 void streamToFile(Trial& trial, const PrintInput& input) {
+    removeFile(input.path);
     trial.time([&] {
         std::ofstream out(input.path);
         Format::prepare(out);

@@ -1,5 +1,6 @@
 #include "benchmarks/job.h"
 
+#include <cstdio>
 #include <fstream>
 #include <iterator>
 #include <stdexcept>
@@ -27,6 +28,10 @@ void Trial::resultOfFile(const std::string& path) {
     if (!comparing) return;
     std::ifstream file(path, std::ios::binary);
     bytesOfResult.append(std::istreambuf_iterator<char>(file), {});
+}
+
+void removeFile(const std::string& path) {
+    std::remove(path.c_str());
 }
 
 }  // namespace bench
