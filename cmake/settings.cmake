@@ -8,6 +8,10 @@ set(CMAKE_POSITION_INDEPENDENT_CODE ON)
 set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/bin)
 set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/lib)
 
+# Programs at random addresses too, where the compiler does not make them so by itself.
+include(CheckPIESupported)
+check_pie_supported(LANGUAGES CXX)
+
 add_library(fileio_settings INTERFACE)
 target_compile_options(fileio_settings INTERFACE -Wall -Wextra -Wconversion -Wshadow -Werror)
 target_compile_definitions(fileio_settings INTERFACE
@@ -18,4 +22,9 @@ if(FILEIO_SANITIZE)
   target_compile_options(fileio_settings INTERFACE
       -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
   target_link_options(fileio_settings INTERFACE -fsanitize=address,undefined)
+else()
+  # Stack and buffers are checked, and symbols bound once and then write-protected.
+  target_compile_options(fileio_settings INTERFACE -fstack-protector-strong
+      $<$<NOT:$<CONFIG:Debug>>:-U_FORTIFY_SOURCE -D_FORTIFY_SOURCE=2>)
+  target_link_options(fileio_settings INTERFACE LINKER:-z,relro,-z,now,-z,noexecstack)
 endif()
