@@ -28,3 +28,8 @@ else()
       $<$<NOT:$<CONFIG:Debug>>:-U_FORTIFY_SOURCE -D_FORTIFY_SOURCE=2>)
   target_link_options(fileio_settings INTERFACE LINKER:-z,relro,-z,now,-z,noexecstack)
 endif()
+if(FILEIO_FUZZ)
+  target_compile_options(fileio_settings INTERFACE
+      -fsanitize=fuzzer-no-link,address,undefined -fno-sanitize-recover=all)
+  target_link_options(fileio_settings INTERFACE -fsanitize=address,undefined)
+endif()

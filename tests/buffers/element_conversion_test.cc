@@ -1,12 +1,10 @@
 #include "fileio/buffers/element_conversion.h"
 
 #include "embedded/services/array.h"
-#include "fileio/buffers/convert_element.h"
+#include "tests/oracle/conversion_oracle.h"
 
 #include <algorithm>
-#include <bit>
 #include <cmath>
-#include <cstring>
 #include <limits>
 #include <vector>
 
@@ -17,17 +15,6 @@ namespace {
 using namespace Orvandeil::FileIO;
 using detail::Logical;
 using embedded::ArrayPtr;
-
-// The oracle computes in extended numbers, which hold every element of every class exactly.
-template <class To>
-long double expectedElement(long double value) {
-    if constexpr (std::is_floating_point_v<To>) return static_cast<To>(value);
-    using Limits = std::numeric_limits<detail::Number<To>>;
-    const long double highest = std::is_same_v<To, Logical> ? 1 : Limits::max();
-    if (std::isnan(value)) return 0;
-    // The sum turns -0, which no integer is, into 0.
-    return std::clamp(std::round(value), static_cast<long double>(Limits::min()), highest) + 0.L;
-}
 
 // The halves around all powers of two, and what is about halfway between two singles, where a step
 // over double would round twice.
@@ -77,38 +64,10 @@ std::vector<Element> samples() {
     return elements;
 }
 
-bool isSame(long double one, long double other) {
-    if (std::isnan(one)) return std::isnan(other);
-    return one == other && (one != 0 || std::signbit(one) == std::signbit(other));
-}
-
-// Converts with both blocks off any alignment, and compares every element. Elements of the same
-// class keep their bits, elsewhere any logical byte but 0 is 1.
-template <class To, class From>
-void checkPair(vxClassID to, vxClassID from, const std::vector<From>& elements) {
-    std::vector<char> source(1 + elements.size() * sizeof(From));
-    std::memcpy(source.data() + 1, elements.data(), source.size() - 1);
-    std::vector<char> target(2 + elements.size() * sizeof(To), 'x');
-    void* end = AssignToVoidBuffer(to, target.data() + 1, from, source.data() + 1, elements.size());
-    ASSERT_EQ(end, &target.back());
-    EXPECT_EQ(target.back(), 'x');
-    if (to == from) {
-        EXPECT_TRUE(std::equal(source.begin() + 1, source.end(), target.begin() + 1)) << to;
-        return;
-    }
-    for (std::size_t i = 0; i < elements.size(); ++i) {
-        auto value = static_cast<long double>(elements[i]);
-        if (from == vxLOGICAL_CLASS) value = value != 0;
-        const auto result = static_cast<long double>(detail::loadElement<To>(target.data() + 1, i));
-        ASSERT_TRUE(isSame(result, expectedElement<To>(value)))
-            << value << " of class " << from << " to " << to << " is " << result;
-    }
-}
-
 template <class From>
 void checkFrom(vxClassID from) {
     const std::vector<From> elements = samples<From>();
-#define CHECK_PAIR(to, To) checkPair<To, From>(to, from, elements);
+#define CHECK_PAIR(to, To) oracle::checkRun<To, From>(to, from, elements);
     FILEIO_FOR_EACH_ELEMENT(CHECK_PAIR)
 #undef CHECK_PAIR
 }

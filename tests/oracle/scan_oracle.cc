@@ -11,7 +11,7 @@ namespace oracle {
 namespace {
 
 using Orvandeil::FileIO::stream;
-using namespace std::string_literals;
+using namespace std::literals;
 
 const std::string hexSet = "[0-9a-fA-F]";
 
@@ -175,29 +175,55 @@ Outcome scanByFscanf(std::FILE* file, Operation operation, long width, int statu
 
 long Fields::width() {
     static constexpr long special[] = {0, 999, 2147483647, 1L << 40, LONG_MAX};
-    if (below(3) == 0) return -1;
-    return below(8) == 0 ? special[below(std::size(special))] : static_cast<long>(1 + below(30));
+    if (input.below(3) == 0) return -1;
+    return input.below(8) == 0 ? input.of(special) : static_cast<long>(1 + input.below(30));
 }
 
 std::string Fields::text(std::size_t tokens) {
-    static const std::string special[] = {"-0",   "0x",    "-0x",   "0X1",     "inf", "-nan", "in",
-                                          "na",   "INF",   "NaN",   "1e+",     "1e5", "1.",   ".5",
-                                          "0b1",  "-.",    "e-",    " -",      "0x.", "+0",   "e+9",
-                                          "0x1e", "1e999", "e-999", "infinity"};
-    static const std::string ends[] = {
-        "9223372036854775807",   "9223372036854775808",    "-9223372036854775808",
-        "-9223372036854775809",  "18446744073709551615",   "18446744073709551616",
-        "-18446744073709551615", "-18446744073709551616",  "0x7fffffffffffffff",
-        "0x8000000000000000",    "0777777777777777777777", "01777777777777777777777"};
-    static const std::string alphabet = " \t\n\0\xFF+-0017789aefinpx.,"s;
+    static const std::string special[] = {"-0",
+                                          "0x",
+                                          "-0x",
+                                          "0X1",
+                                          "inf",
+                                          "-nan",
+                                          "in",
+                                          "na",
+                                          "INF",
+                                          "NaN",
+                                          "1e+",
+                                          "1e5",
+                                          "1.",
+                                          ".5",
+                                          "0b1",
+                                          "-.",
+                                          "e-",
+                                          " -",
+                                          "0x.",
+                                          "+0",
+                                          "e+9",
+                                          "0x1e",
+                                          "1e999",
+                                          "e-999",
+                                          "infinity",
+                                          "9223372036854775807",
+                                          "9223372036854775808",
+                                          "-9223372036854775808",
+                                          "-9223372036854775809",
+                                          "18446744073709551615",
+                                          "18446744073709551616",
+                                          "-18446744073709551615",
+                                          "-18446744073709551616",
+                                          "0x7fffffffffffffff",
+                                          "0x8000000000000000",
+                                          "0777777777777777777777",
+                                          "01777777777777777777777"};
     std::string result;
     for (std::size_t i = 0; i < tokens; ++i) {
-        const std::size_t kind = below(12);
-        result += kind < 2    ? special[below(std::size(special))]
-                  : kind == 2 ? std::string(20 + below(41), "0179af"[below(6)])
-                  : kind == 3 ? std::to_string(random())
-                  : kind == 4 ? ends[below(std::size(ends))]
-                              : std::string(1, alphabet[below(alphabet.size())]);
+        const std::size_t kind = input.below(12), number = input.below(64);
+        result += kind < 3    ? input.of(special)
+                  : kind == 3 ? std::string(20 + number, input.of("0179af"sv))
+                  : kind == 4 ? std::to_string(input.number(8) >> number)
+                              : std::string(1, input.of(" \t\n\0\xFF+-0017789aefinpx.,"sv));
     }
     return result;
 }

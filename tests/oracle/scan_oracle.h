@@ -1,10 +1,10 @@
 #pragma once
 
 #include "fileio/streams/stream.h"
+#include "tests/properties/bytes.h"
 
 #include <climits>
 #include <cstdio>
-#include <random>
 #include <string>
 
 // What the scan operations of streams have to give, told once more with the C library. Slow and
@@ -32,19 +32,20 @@ Outcome wholeNumber(Operation operation, const char* field, char** end);
 // status on entry. A failure stores its code.
 Outcome scanByFscanf(std::FILE* file, Operation operation, long width, int status, int& errorCode);
 
-// Random numbers, what nearly are numbers, and ways to scan them.
+// Numbers, what nearly are numbers, and ways to scan them.
 class Fields {
 public:
-    explicit Fields(unsigned seed) : random(seed) {}
+    explicit Fields(properties::Bytes& bytes) : input(bytes) {}
 
-    std::size_t below(std::size_t bound) { return random() % bound; }
-    Operation operation() { return static_cast<Operation>(below(operationCount)); }
-    int entryStatus() { return below(8) == 0 ? static_cast<int>(below(2)) * 5 : INT_MAX; }
+    Operation operation() { return static_cast<Operation>(input.below(operationCount)); }
+    int entryStatus() {
+        return input.below(8) == 0 ? static_cast<int>(input.below(2)) * 5 : INT_MAX;
+    }
     long width();
     std::string text(std::size_t tokens);
 
 private:
-    std::mt19937 random;
+    properties::Bytes& input;
 };
 
 }  // namespace oracle

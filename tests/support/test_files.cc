@@ -9,6 +9,8 @@
 #include <iterator>
 #include <unistd.h>
 
+#include <sys/mman.h>
+
 namespace support {
 namespace {
 
@@ -47,6 +49,11 @@ int seek(void* cookie, off64_t* offset, int whence) {
     return 0;
 }
 
+std::string contentOf(const std::string& path) {
+    std::ifstream file(path, std::ios::binary);
+    return {std::istreambuf_iterator<char>(file), {}};
+}
+
 }  // namespace
 
 TempFile::TempFile(std::string_view content) {
@@ -56,8 +63,19 @@ TempFile::TempFile(std::string_view content) {
 }
 
 std::string TempFile::content() const {
-    std::ifstream file(filePath, std::ios::binary);
-    return {std::istreambuf_iterator<char>(file), {}};
+    return contentOf(filePath);
+}
+
+MemoryFile::MemoryFile(std::string_view content) : descriptor(memfd_create("test", MFD_CLOEXEC)) {
+    std::ofstream(path(), std::ios::binary) << content;
+}
+
+MemoryFile::~MemoryFile() {
+    close(descriptor);
+}
+
+std::string MemoryFile::content() const {
+    return contentOf(path());
 }
 
 OpenedFile::OpenedFile(const std::string& path, const char* mode, const std::string& encoding)

@@ -25,6 +25,21 @@ private:
     std::string filePath;
 };
 
+// A file of its own in memory, which goes by a path.
+class MemoryFile {
+public:
+    explicit MemoryFile(std::string_view content);
+    ~MemoryFile();
+    MemoryFile(const MemoryFile&) = delete;
+    MemoryFile& operator=(const MemoryFile&) = delete;
+
+    std::string path() const { return "/proc/self/fd/" + std::to_string(descriptor); }
+    std::string content() const;
+
+private:
+    int descriptor;
+};
+
 // A file opened by path and permission, and the stream over it.
 struct OpenedFile {
     explicit OpenedFile(const std::string& path, const char* mode = "r",

@@ -1,14 +1,14 @@
 #include "fileio/scanf/scan_control.h"
 #include "fileio/text/input_string_stream.h"
 #include "tests/oracle/scan_oracle.h"
+#include "tests/properties/properties.h"
 #include "tests/support/arrays.h"
 #include "tests/support/printing.h"
 #include "tests/support/test_files.h"
 
 #include <cerrno>
 
-#include <gtest/gtest.h>
-
+namespace properties {
 namespace {
 
 using namespace Orvandeil::FileIO;
@@ -28,14 +28,15 @@ const std::string encodings[] = {"", "UTF-8", "ISO-8859-1", "Shift_JIS", "UTF-16
 // Text that a format reads well, with a fault now and then.
 class Inputs : public oracle::Fields {
 public:
-    using Fields::Fields;
+    explicit Inputs(Bytes& bytes) : Fields(bytes), input(bytes) {}
 
+    std::size_t below(std::size_t bound) { return input.below(bound); }
     std::string text(const std::string& format, std::size_t rounds) {
         std::string result;
         const std::size_t faults = 20 + below(200);
         for (; rounds != 0; --rounds) {
             for (std::size_t i = 0; i < format.size(); ++i) {
-                if (below(faults) == 0) result += below(2) == 0 ? "\0"s : Fields::text(1);
+                if (below(faults) + 1 == faults) result += below(2) == 0 ? "\0"s : Fields::text(1);
                 if ((format[i] == '%' || format[i] == ' ') && below(4) == 0)
                     result += " \n\t\v"[below(4)];
                 if (format[i] == '%' && format[++i] != '%') {
@@ -59,6 +60,8 @@ private:
         if (below(3) == 0) result.insert(0, below(3) == 0 ? "+" : "-");
         return result + " "s.substr(below(2));
     }
+
+    Bytes& input;
 };
 
 // Scans, steps back, and tells all that shows of it.
@@ -84,31 +87,30 @@ std::string scanBy(TcodnStream& stream, const std::string& format, long limit, u
     return seen + ' ' + std::string(rest, stream.GetNElements(sizeof rest, rest, 1));
 }
 
-TEST(ScanProgram, DoesWhatThePiecesDo) {
-    Inputs inputs(3);
-    for (int trial = 0; trial < 20000 && !HasFailure(); ++trial) {
-        const std::string& format = formats[inputs.below(std::size(formats))];
-        const std::string& encoding = encodings[inputs.below(std::size(encodings))];
-        const std::string text = inputs.text(format, inputs.below(40));
-        const long limit = inputs.below(3) == 0 ? -1 : static_cast<long>(inputs.below(20));
-        const bool canSeek = inputs.below(2) == 0;
-        const std::size_t readAhead = 1 + inputs.below(60);
-        const unsigned long back = 1 + inputs.below(3);
-        const auto fromFile = [&](auto scan) {
-            support::FaultyFile file{
-                .bytes = text, .failingSeek = canSeek ? 0 : 1, .error = ESPIPE};
-            support::OpenedFile opened(file.open("r", readAhead), "r", encoding);
-            return scan(opened.stream, format, limit, back);
-        };
-        const auto fromText = [&](auto scan) {
-            inputStringStream stream(text.c_str(), std::ssize(text), encoding);
-            return scan(stream, format, limit, back);
-        };
-        EXPECT_EQ(fromFile(scanBy<scanControl>), fromFile(scanBy<PlainControl>))
-            << format << " of " << testing::PrintToString(text) << " in " << encoding;
-        EXPECT_EQ(fromText(scanBy<scanControl>), fromText(scanBy<PlainControl>))
-            << format << " of " << testing::PrintToString(text) << " in " << encoding;
-    }
+}  // namespace
+
+// A format run in one go does what its pieces do.
+void scanPrograms(Bytes& input) {
+    Inputs inputs(input);
+    const std::string &format = input.of(formats), &encoding = input.of(encodings);
+    const long limit = input.below(3) == 0 ? -1 : static_cast<long>(input.below(20));
+    const bool canSeek = input.below(2) == 0;
+    const std::size_t readAhead = 1 + input.below(60);
+    const unsigned long back = 1 + input.below(3);
+    const std::string text = inputs.text(format, input.below(40));
+    const std::string where = format + " of " + text + " in " + encoding;
+    const auto fromFile = [&](auto scan) {
+        support::FaultyFile file{.bytes = text, .failingSeek = canSeek ? 0 : 1, .error = ESPIPE};
+        support::OpenedFile opened(file.open("r", readAhead), "r", encoding);
+        return scan(opened.stream, format, limit, back);
+    };
+    const auto fromText = [&](auto scan) {
+        inputStringStream stream(text.c_str(), std::ssize(text), encoding);
+        return scan(stream, format, limit, back);
+    };
+    const std::string seen = fromFile(scanBy<scanControl>) + fromText(scanBy<scanControl>);
+    requireEqual(seen, fromFile(scanBy<PlainControl>) + fromText(scanBy<PlainControl>), where);
+    input.observe(seen);
 }
 
-}  // namespace
+}  // namespace properties

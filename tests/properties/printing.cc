@@ -1,0 +1,228 @@
+#include "tests/support/printing.h"
+
+#include "embedded/services/element_types.h"
+#include "fileio/host/memory.h"
+#include "fileio/printf/printf_controller.h"
+#include "fileio/text/output_string_stream.h"
+#include "tests/properties/properties.h"
+#include "tests/support/raised.h"
+#include "tests/support/test_files.h"
+
+#include <cctype>
+#include <cmath>
+#include <cstdio>
+#include <cstring>
+#include <type_traits>
+
+// The C library's printf is the referee for whatever a number looks like. A stream of a class that
+// the library does not know is written to in the plainest way: it is the referee for all the rest.
+
+namespace properties {
+namespace {
+
+using namespace Orvandeil::FileIO;
+using namespace Orvandeil::FileIO::embedded;
+using Arguments = std::vector<const vxArray*>;
+
+constexpr vxClassID classes[] = {vxDOUBLE_CLASS, vxDOUBLE_CLASS, vxSINGLE_CLASS, vxINT8_CLASS,
+                                 vxINT16_CLASS,  vxINT32_CLASS,  vxINT64_CLASS,  vxUINT8_CLASS,
+                                 vxUINT16_CLASS, vxUINT32_CLASS, vxUINT64_CLASS, vxCHAR_CLASS,
+                                 vxLOGICAL_CLASS};
+
+// One or two rows of up to 40 elements.
+ArrayPtr anyNumbers(Bytes& input, vxClassID classID) {
+    const std::size_t columns = input.below(input.below(4) == 0 ? 40 : 5);
+    ArrayPtr array = makeNumeric(classID, {1 + input.below(8) / 7, columns});
+    const auto fill = [&]<class T>(ElementType<T>) {
+        for (std::size_t i = 0; i < elementCount(*array); ++i) {
+            T& element = static_cast<T*>(realData(*array))[i];
+            if constexpr (std::is_floating_point_v<T>)
+                element = static_cast<T>(input.real());
+            else
+                element = static_cast<T>(classID == vxLOGICAL_CLASS
+                                             ? input.below(2)
+                                             : input.number(1 + input.below(2) * (sizeof(T) - 1)));
+        }
+    };
+    withElementType(classID, fill, [] {});
+    return array;
+}
+
+template <class... Values>
+std::string formatted(const std::string& format, Values... values) {
+    char text[1024];
+    std::snprintf(text, sizeof text, format.c_str(), values...);
+    return text;
+}
+
+std::string nonFinite(const std::string& start, int width, double value) {
+    const auto has = [&](char flag) { return start.find(flag) != start.npos; };
+    const char* const positive = has('+') ? "+Inf" : has(' ') ? " Inf" : "Inf";
+    return formatted("%*s", has('-') ? -width : width,
+                     std::isnan(value) ? "NaN"
+                     : value < 0       ? "-Inf"
+                                       : positive);
+}
+
+// What a conversion cannot hold is shown in the exponent form of the same flags.
+template <class T>
+std::string expectedNumber(const std::string& start, char conversion, int width, T value) {
+    const auto exact = static_cast<long double>(value);
+    const bool isWhole = std::trunc(exact) == exact;
+    const bool isSigned = conversion == 'd' || conversion == 'i';
+    if (!std::isfinite(exact)) return nonFinite(start, width, static_cast<double>(value));
+    if (std::strchr("eEfgG", conversion))
+        return formatted(start + conversion, static_cast<double>(value));
+    if (isSigned && isWhole && exact >= -0x1p63L && exact < 0x1p63L)
+        return formatted(start + "ll" + conversion, static_cast<long long>(value));
+    if (!isSigned && isWhole && exact >= 0 && exact < 0x1p64L)
+        return formatted(start + "ll" + conversion, static_cast<unsigned long long>(value));
+    return formatted(start + "e", static_cast<double>(value));
+}
+
+// Any flags, width and precision, to be followed by a conversion.
+std::string anyStart(Bytes& input, std::size_t width) {
+    std::string start = "%";
+    const std::size_t flags = input.below(3) == 0 ? input.below(32) : 0;
+    for (std::size_t i = 0; i < 5; ++i) {
+        if (flags >> i & 1) start += "-+ #0"[i];
+    }
+    if (width != 0) start += std::to_string(width);
+    if (input.below(2) == 0) start += '.' + std::to_string(input.below(30));
+    return start;
+}
+
+// An array through one conversion between literals.
+void againstC(Bytes& input) {
+    static const std::string around[] = {"", " ", ",", "\n", "x = ", "é"};
+    const std::size_t width = input.below(3) == 0 ? input.below(40) : 0;
+    const std::string start = anyStart(input, width);
+    const char conversion = input.of(std::string_view("diouxXeEfgG"));
+    const std::string before = input.of(around), after = input.of(around);
+    const ArrayPtr array = anyNumbers(input, input.of(classes));
+    std::string wanted;
+    const auto append = [&]<class T>(ElementType<T>) {
+        for (std::size_t i = 0; i < elementCount(*array); ++i) {
+            const T value = static_cast<const T*>(vxArrayData(array.get()))[i];
+            wanted +=
+                before + expectedNumber(start, conversion, static_cast<int>(width), value) + after;
+        }
+    };
+    withElementType(vxArrayClassID(array.get()), append, [] {});
+    const std::string format = before + start + conversion + after;
+    const std::string text = fileio_tests::print(format, array).summary();
+    if (!wanted.empty()) requireEqual(text, wanted, format);
+    input.observe(text);
+}
+
+std::string print(TcodnStream& out, const std::u16string& format, Arguments arguments) {
+    printfController controller(format, &out, arguments.data(), static_cast<int>(arguments.size()));
+    bool complete = false;
+    const std::string raised = fileio_tests::raisedBy([&] { complete = controller.doPrintf(); });
+    return " complete " + std::to_string(complete) + " code " +
+           std::to_string(controller.getErrorCode()) + " error " +
+           std::to_string(out.getErrorCode()) + ' ' + raised;
+}
+
+template <class Stream>
+std::string printToString(const std::string& encoding, const std::u16string& format,
+                          const Arguments& arguments) {
+    Stream out(encoding);
+    const std::string end = print(out, format, arguments);
+    long bytes = 0;
+    out.getPosition(bytes);
+    void* const block = out.transferBuffer();
+    const std::string text(static_cast<char*>(block), static_cast<std::size_t>(bytes));
+    vxMemoryFree(block);
+    return text + end;
+}
+
+template <class Stream>
+std::string printToFile(const std::string& encoding, const std::u16string& format,
+                        const Arguments& arguments) {
+    support::FaultyFile memory;
+    std::FILE* const file = memory.open("w", 64);
+    FilePermission permission("w", false);
+    std::string end;
+    {
+        Stream out(file, encoding, permission, u"");
+        end = print(out, format, arguments);
+    }
+    std::fclose(file);
+    return memory.bytes + end;
+}
+
+struct UnknownStringStream : outputStringStream {
+    using outputStringStream::outputStringStream;
+};
+struct UnknownFileStream : fileStream {
+    using fileStream::fileStream;
+};
+
+ArrayPtr anyArgument(Bytes& input, bool areWidths) {
+    static const std::string parts[] = {"a", "é", "€", "\xF0\x9F\x98\x80", "%d", ""};
+    const std::size_t kind = areWidths ? 2 : input.below(5);
+    if (kind == 0) return makeChars(fileio_tests::toUtf16(input.text(parts, 30)));
+    if (kind == 1) return makeStrings({fileio_tests::toUtf16(input.text(parts, 9)), u"b"}, {1, 2});
+    if (!areWidths) return anyNumbers(input, input.of(classes));
+    ArrayPtr array = anyNumbers(input, vxDOUBLE_CLASS);
+    for (std::size_t i = 0; i < elementCount(*array); ++i) {
+        double& width = static_cast<double*>(realData(*array))[i];
+        if (std::abs(width) > 99 && std::abs(width) < 0x1p31) width = 70;
+    }
+    return array;
+}
+
+// Widths of many digits would only make long texts.
+bool hasLongNumber(const std::string& format) {
+    std::size_t digits = 0;
+    for (const char letter : format) {
+        digits = std::isdigit(static_cast<unsigned char>(letter)) ? digits + 1 : 0;
+        if (digits > 2) return true;
+    }
+    return false;
+}
+
+void againstUnknownStreams(Bytes& input) {
+    static const std::string parts[] = {"%d",   "%f",
+                                        "%g",   "%s",
+                                        "%c",   "%5.3e",
+                                        "%x",   "%bx",
+                                        "%to",  "%-",
+                                        "%0",   "%+",
+                                        "%.",   "%*d",
+                                        "%.*f", "%1$d",
+                                        "%2$s", "*1$",
+                                        "%ld",  "%%",
+                                        "%",    ", ",
+                                        "\n",   "é",
+                                        "€",    "\xF0\x9F\x98\x80",
+                                        "$",    "%-8.3f",
+                                        "%12d", "%i",
+                                        "%u"};
+    static const char* const encodings[] = {"",       "",          "UTF-8", "ISO-8859-1",
+                                            "UTF-16", "Shift_JIS", "UTF-7", "UTF-32BE"};
+    const std::string text = input.text(parts, 20), encoding = input.of(encodings);
+    if (hasLongNumber(text)) return;
+    const bool areWidths = text.find('*') != text.npos;
+    std::vector<ArrayPtr> owned(input.below(4));
+    Arguments arguments;
+    for (ArrayPtr& argument : owned)
+        arguments.push_back((argument = anyArgument(input, areWidths)).get());
+    const std::u16string format = fileio_tests::toUtf16(text);
+    const std::string seen = printToString<outputStringStream>(encoding, format, arguments);
+    requireEqual(seen, printToString<UnknownStringStream>(encoding, format, arguments), text);
+    input.observe(seen);
+    if (encoding.empty()) return;
+    requireEqual(printToFile<fileStream>(encoding, format, arguments),
+                 printToFile<UnknownFileStream>(encoding, format, arguments), text + " to a file");
+}
+
+}  // namespace
+
+void printing(Bytes& input) {
+    if (input.below(2) == 0) return againstC(input);
+    againstUnknownStreams(input);
+}
+
+}  // namespace properties
