@@ -97,5 +97,6 @@ void addScanJobs(JobList& jobs);
 void addReadJobs(JobList& jobs);
 void addWriteJobs(JobList& jobs);
 void addConvertJobs(JobList& jobs);
+void addTranscodeJobs(JobList& jobs);
 
 }  // namespace bench

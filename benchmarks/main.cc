@@ -61,6 +61,7 @@ JobList allJobs() {
     addReadJobs(jobs);
     addWriteJobs(jobs);
     addConvertJobs(jobs);
+    addTranscodeJobs(jobs);
     return jobs;
 }
 
