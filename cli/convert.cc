@@ -59,7 +59,7 @@ void runConvert(const CommandLine& line, Report& report) {
     if (report.isJson()) {
         report.object().arrayKeys(*result);
     } else {
-        report.print(plainText(*result));
+        printPlain(*result, report);
     }
 }
 

@@ -7,6 +7,8 @@
 #include "fileio/host/text.h"
 
 #include <span>
+#include <string>
+#include <string_view>
 
 namespace cli {
 
@@ -19,51 +21,75 @@ std::span<const T> elementsOf(const vxArray& array) {
     return {static_cast<const T*>(vxArrayData(&array)), embedded::elementCount(array)};
 }
 
+// Text on its way out, in a block of its own.
+class Block {
+public:
+    explicit Block(Report& target) : report(target) {}
+
+    // Room for one number and what follows it; end() takes what was put there.
+    char* room() {
+        if (static_cast<std::size_t>(text + sizeof text - next) <= longestNumber) flush();
+        return next;
+    }
+    void end(char* newEnd) { next = newEnd; }
+
+    void flush() {
+        report.print({text, static_cast<std::size_t>(next - text)});
+        next = text;
+    }
+
+private:
+    Report& report;
+    char text[16384];
+    char* next = text;
+};
+
 template <class T>
-std::string numberLines(std::span<const T> elements, std::size_t rows) {
-    std::string text;
+void printNumbers(std::span<const T> elements, std::size_t rows, Report& report) {
+    Block block(report);
     for (std::size_t row = 0; row < rows; ++row) {
         for (std::size_t i = row; i < elements.size(); i += rows) {
-            if (i != row) text += '\t';
-            text += NumberText(elements[i]).view();
+            char* const end = writeNumber(elements[i], block.room());
+            *end = elements.size() - i > rows ? '\t' : '\n';
+            block.end(end + 1);
         }
-        text += '\n';
     }
-    return text;
+    block.flush();
 }
 
-std::string charLines(std::span<const char16_t> units, std::size_t rows) {
-    std::string text;
+void printText(std::u16string_view text, Report& report) {
+    report.print(vxTextToNarrow(text.data(), text.size()) + '\n');
+}
+
+void printChars(std::span<const char16_t> units, std::size_t rows, Report& report) {
     for (std::size_t row = 0; row < rows; ++row) {
         std::u16string line;
         for (std::size_t i = row; i < units.size(); i += rows)
             line += units[i];
-        text += vxTextToNarrow(line.data(), line.size()) + '\n';
+        printText(line, report);
     }
-    return text;
 }
 
-std::string stringLines(const vxArray& array) {
-    std::string text;
+void printStrings(const vxArray& array, Report& report) {
     for (std::size_t i = 0; i < embedded::elementCount(array); ++i) {
         const bool isMissing = vxStringArrayIsMissing(&array, i);
-        const std::u16string element = isMissing ? u"<missing>" : vxStringArrayText(&array, i);
-        text += vxTextToNarrow(element.data(), element.size()) + '\n';
+        printText(isMissing ? u"<missing>" : vxStringArrayText(&array, i), report);
     }
-    return text;
 }
 
 }  // namespace
 
-std::string plainText(const vxArray& array) {
-    if (vxStringArrayIs(&array)) return stringLines(array);
+void printPlain(const vxArray& array, Report& report) {
+    if (vxStringArrayIs(&array)) return printStrings(array, report);
     const std::size_t rows = embedded::elementCount(array) == 0 ? 0 : vxArrayDimensions(&array)[0];
     const vxClassID classID = vxArrayClassID(&array);
-    if (classID == vxCHAR_CLASS) return charLines(elementsOf<char16_t>(array), rows);
-    return embedded::withElementType(
+    if (classID == vxCHAR_CLASS) return printChars(elementsOf<char16_t>(array), rows, report);
+    embedded::withElementType(
         classID,
-        [&]<class T>(embedded::ElementType<T>) { return numberLines(elementsOf<T>(array), rows); },
-        [] { return std::string(); });
+        [&]<class T>(embedded::ElementType<T>) {
+            printNumbers(elementsOf<T>(array), rows, report);
+        },
+        [] {});
 }
 
 }  // namespace cli

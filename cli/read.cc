@@ -26,12 +26,12 @@ embedded::ReadAttributes attributesOf(const CommandLine& line) {
 }
 
 // Characters read into a column are one text, not a line for each.
-std::string shownText(const vxArray& array) {
+void printPlainly(const vxArray& array, Report& report) {
     const bool isTextColumn =
         vxArrayClassID(&array) == vxCHAR_CLASS && vxArrayDimensions(&array)[1] == 1;
-    if (!isTextColumn) return plainText(array);
+    if (!isTextColumn) return printPlain(array, report);
     const auto* units = static_cast<const char16_t*>(vxArrayData(&array));
-    return vxTextToNarrow(units, vxArrayDimensions(&array)[0]) + '\n';
+    report.print(vxTextToNarrow(units, vxArrayDimensions(&array)[0]) + '\n');
 }
 
 void show(const embedded::ReadResult& result, const CommandLine& line, Report& report) {
@@ -40,7 +40,7 @@ void show(const embedded::ReadResult& result, const CommandLine& line, Report& r
     } else if (report.isJson()) {
         report.object().arrayKeys(*result.array);
     } else {
-        report.print(shownText(*result.array));
+        printPlainly(*result.array, report);
     }
 }
 

@@ -61,7 +61,7 @@ embedded::ScanResult scanFile(const std::u16string& format, const CommandLine& l
 }
 
 void show(const embedded::ScanResult& result, Report& report) {
-    if (!report.isJson()) return report.print(plainText(*result.array));
+    if (!report.isJson()) return printPlain(*result.array, report);
     report.key("count", result.count);
     if (result.position) {
         report.key("position", *result.position);
