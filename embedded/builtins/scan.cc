@@ -16,7 +16,7 @@
 namespace Orvandeil::FileIO::embedded {
 namespace {
 
-constexpr std::size_t usualChunk = 1024;
+constexpr std::size_t usualChunk = 64;
 constexpr std::size_t largestChunk = 8388608;
 
 void padWithZeros(OutputBuffer& values, std::size_t missing) {
@@ -79,10 +79,24 @@ std::string encodingWithoutMark(const std::string& name) {
     return std::ranges::find(marked, icuName) == marked.end() ? icuName : icuName + "BE";
 }
 
+// Most texts, in the usual encoding, without a converter; false for any other.
+bool encodeAscii(const std::u16string& text, const std::string& encoding, std::string& bytes) {
+    if (!encoding.empty() && encoding != "UTF-8") return false;
+    char16_t used = 0;
+    for (const char16_t unit : text)
+        used |= unit;
+    if (used >= 0x80) return false;
+    bytes.resize(text.size());
+    std::ranges::transform(text, bytes.begin(),
+                           [](char16_t unit) { return static_cast<char>(unit); });
+    return true;
+}
+
 // Complete with what a stateful encoding ends a text with, which a stream leaves pending.
 std::string encoded(const std::u16string& text, const std::string& encoding) {
-    outputStringStream encoder(encodingWithoutMark(encoding));
     std::string bytes;
+    if (encodeAscii(text, encoding, bytes)) return bytes;
+    outputStringStream encoder(encodingWithoutMark(encoding));
     const char16_t* next = text.data();
     UErrorCode status;
     do {

@@ -3,6 +3,7 @@
 #include "fileio/constants.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <cstring>
 #include <memory>
 
@@ -30,6 +31,17 @@ unsigned long countUnits(UConverter* converter, const char*& next, const char* e
     next = pieceEnd;
     return total;
 }
+
+#ifdef FILEIO_FAST_PATHS
+const char* findNonAscii(const char* next, const char* end) {
+    constexpr std::uint64_t highBits = 0x8080808080808080;
+    for (std::uint64_t block; end - next >= long{sizeof block}; next += sizeof block) {
+        std::memcpy(&block, next, sizeof block);
+        if ((block & highBits) != 0) break;
+    }
+    return std::find_if(next, end, [](char byte) { return (byte & 0x80) != 0; });
+}
+#endif
 
 }  // namespace
 
@@ -78,6 +90,16 @@ std::string inputStringStream::DetectCharset(unsigned long) const {
 }
 
 unsigned long inputStringStream::getUTF16Position() {
+    const char* next = begin;
+#ifdef FILEIO_FAST_PATHS
+    if (readsAsciiAsIs() && DetectCharset(0) == "UTF-8") next = findNonAscii(begin, current);
+#endif
+    const auto ascii = static_cast<unsigned long>(next - begin);
+    return next == current ? ascii : ascii + countUTF16(next);
+}
+
+// The units from `next` on, with which a character begins.
+unsigned long inputStringStream::countUTF16(const char* next) {
     // A converter of its own: what the reading one holds back belongs to the next read.
     UErrorCode status = U_ZERO_ERROR;
     const std::unique_ptr<UConverter, CloseConverter> counter(ucnv_clone(GetConv(0), &status));
@@ -87,7 +109,7 @@ unsigned long inputStringStream::getUTF16Position() {
     }
     ucnv_resetToUnicode(counter.get());
     unsigned long total = 0;
-    for (const char* next = begin; next != current;) {
+    while (next != current) {
         total += countUnits(counter.get(), next, current);
     }
     return total;

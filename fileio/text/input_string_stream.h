@@ -59,6 +59,7 @@ public:
 private:
     friend struct LayoutProbe;
 
+    unsigned long countUTF16(const char* next);
     std::optional<std::string_view> numberText(long width, int& status);
     void take(std::size_t consumed, int& status);
     long scanSigned(const detail::IntegerScan& operation, long width, int& status);
