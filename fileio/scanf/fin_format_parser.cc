@@ -29,7 +29,9 @@ finFormatParser::finFormatParser(const char16_t* format, TcodnStream* readFrom)
 finFormatParser::~finFormatParser() = default;
 
 void finFormatParser::InitFormatPieces() {
+    constexpr std::size_t usualPieces = 8;
     resultClass = vxCHAR_CLASS;
+    pieces.reserve(usualPieces);
     do {
         Piece piece = fiPkCreateNextScanFormatPiece();
         if (!piece) {

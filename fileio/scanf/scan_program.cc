@@ -19,10 +19,6 @@
 namespace Orvandeil::FileIO::detail {
 namespace {
 
-constexpr bool isBlank(char byte) {
-    return byte == ' ' || (byte >= '\t' && byte <= '\r');
-}
-
 // A host may have other blanks than C.
 bool hostKnowsBlanks() {
     constexpr std::u16string_view blanks = u" \t\n\v\f\r";
@@ -32,14 +28,14 @@ bool hostKnowsBlanks() {
 // How a file stream reads numbers.
 struct NumbersOfFile {
     static constexpr bool isAll = false;
-    static bool isSkipped(char byte) { return isBlank(byte); }
+    static bool isSkipped(char byte) { return isCBlank(byte); }
     static bool takeDouble(FieldBytes& bytes, double& value) { return takeReal(bytes, value); }
 };
 
 // How a text in memory does. Real numbers have the host's syntax.
 struct NumbersOfText {
     static constexpr bool isAll = true;
-    static bool isSkipped(char byte) { return isBlank(byte) || byte == 0; }
+    static bool isSkipped(char byte) { return isCBlank(byte) || byte == 0; }
     static bool takeDouble(FieldBytes& bytes, double& value) {
         FieldBytes digits = bytes;
         digits.takeMinus();
@@ -97,7 +93,7 @@ bool ScanProgram::addLiteral(std::u16string_view text) {
         const char16_t unit = text[i];
         if (unit >= 0x80) return false;
         const bool blank = qzu_isbreakablespace(unit);
-        if (blank && !isBlank(static_cast<char>(unit))) return false;
+        if (blank && !isCBlank(static_cast<char>(unit))) return false;
         steps.push_back(
             {.kind = blank ? Step::Blanks : Step::Character, .character = static_cast<char>(unit)});
         if (unit == u'%') ++i;
@@ -150,7 +146,7 @@ ScanProgram::Run ScanProgram::runOn(Stream& stream, std::size_t nextPiece, char*
             if (!bytes.startsWith(step->character)) break;
             ++bytes.next;
         } else if (step->kind == Step::Blanks) {
-            bytes.skip(isBlank);
+            bytes.skip(isCBlank);
         } else {
             bytes.skip(Numbers::isSkipped);
             std::uint64_t bits = 0;
@@ -188,7 +184,7 @@ bool ScanProgram::takeNumber(Step::Kind kind, FieldBytes& bytes, std::uint64_t& 
     return true;
 }
 
-std::uint64_t ScanProgram::bitsOf(Step::Kind kind, const DecimalInteger& number) const {
+inline std::uint64_t ScanProgram::bitsOf(Step::Kind kind, const DecimalInteger& number) const {
     switch (kind) {
         case Step::Short:
             return stored(limited<short>(number));

@@ -22,6 +22,11 @@ inline constexpr auto integerPowersOfTen = [] {
     return powers;
 }();
 
+// The blanks of the C locale, whatever the locale in use.
+constexpr bool isCBlank(char byte) {
+    return byte == ' ' || (byte >= '\t' && byte <= '\r');
+}
+
 // Bytes in memory. `isAll` tells that the data end with them; else the byte behind a number must be
 // among them, as it may belong to it.
 struct FieldBytes {
@@ -29,6 +34,12 @@ struct FieldBytes {
     const char* end;
     bool isAll;
 
+    // Nothing behind a width belongs to a number; a negative one is none.
+    void cutTo(long width) {
+        if (width < 0 || end - next < width) return;
+        end = next + width;
+        isAll = true;
+    }
     bool mayEnd() const { return next != end || isAll; }
     bool startsWith(char byte) const { return next != end && *next == byte; }
     template <class Test>
@@ -36,9 +47,11 @@ struct FieldBytes {
         while (next != end && test(*next))
             ++next;
     }
+    // Without branches, as signs may come in any order.
     bool takeMinus() {
-        const bool negative = startsWith('-');
-        if (negative || startsWith('+')) ++next;
+        if (next == end) return false;
+        const bool negative = *next == '-';
+        next += static_cast<int>(negative) | static_cast<int>(*next == '+');
         return negative;
     }
 };

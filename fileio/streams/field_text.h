@@ -10,8 +10,6 @@ namespace Orvandeil::FileIO::detail {
 // by one thread at a time, so nothing is locked.
 class FieldText {
 public:
-    static constexpr std::size_t capacity = 64;
-
     explicit FieldText(std::FILE* source) : file(source) {}
 
     int next() { return getc_unlocked(file); }
@@ -37,13 +35,12 @@ public:
     }
 
     std::size_t size() const { return length; }
-    bool isFull() const { return length == capacity; }
     std::string_view view() const { return {bytes, length}; }
 
 private:
     std::FILE* file;
     std::size_t length = 0;
-    char bytes[capacity];
+    char bytes[32];  // more than any field keeps
 };
 
 }  // namespace Orvandeil::FileIO::detail

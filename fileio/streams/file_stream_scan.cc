@@ -1,7 +1,7 @@
 #include "fileio/errors/code_list.h"
+#include "fileio/streams/decimal_field.h"
 #include "fileio/streams/field_text.h"
 #include "fileio/streams/file_stream.h"
-#include "fileio/streams/plain_decimal.h"
 #include "fileio/streams/scan_operation.h"
 
 #include <algorithm>
@@ -195,14 +195,21 @@ bool scanByLibrary(std::FILE* file, long width, double& value) {
     return std::fscanf(file, format, &value) == 1;
 }
 
-bool takePlainDecimal([[maybe_unused]] std::FILE* file, [[maybe_unused]] long width,
-                      [[maybe_unused]] double& value) {
 #ifdef FILEIO_FAST_PATHS
-    return detail::PlainDecimal(file, width).take(value);
-#else
-    return false;
-#endif
+// Takes the next number where it lies read ahead of the file, and the byte behind it too, unless
+// the width ends there.
+template <class Number>
+bool takeAhead(std::FILE* file, long width, bool (*take)(detail::FieldBytes&, Number&),
+               Number& number) {
+    const std::string_view ahead = detail::bytesReadAhead(file);
+    detail::FieldBytes bytes = {ahead.data(), ahead.data() + ahead.size(), false};
+    bytes.skip(detail::isCBlank);
+    bytes.cutTo(width);
+    if (!take(bytes, number)) return false;
+    detail::takeReadAhead(file, bytes.next);
+    return true;
 }
+#endif
 
 }  // namespace
 
@@ -220,6 +227,11 @@ void fileStream::takeScanned(const char* next) {
 
 IntegerField fileStream::scanField(const IntegerScan& operation, long width, int& status) {
     beginScan();
+#ifdef FILEIO_FAST_PATHS
+    detail::DecimalInteger number;
+    if (operation.base == 10 && takeAhead(file, width, detail::takeInteger, number))
+        return {.consumed = 1, .magnitude = number.magnitude, .negative = number.negative};
+#endif
     IntegerCollector collector(file, operation, width);
     if (!collector.collect()) {
         recordFailure();
@@ -254,6 +266,12 @@ long fileStream::scanIntegerCouldBeHex(long width, int& status) {
 
 double fileStream::scanFloat(long width, int& status) {
     beginScan();
+#ifdef FILEIO_FAST_PATHS
+    if (double value = 0; takeAhead(file, width, detail::takeReal, value)) {
+        status = untouched;
+        return value;
+    }
+#endif
     FloatStart start(file);
     if (start.isNonFinite()) {
         if (status == untouched) return start.nonFiniteValue();
@@ -272,7 +290,6 @@ double fileStream::scanNumber(long width, int sign, int& status) {
     status = untouched;
     double value = 0;
     if (width != 0) {
-        if (takePlainDecimal(file, width, value)) return value;
         errno = 0;
         if (scanByLibrary(file, width, value)) return value;
         if (sign != 0) std::ungetc(sign, file);
