@@ -93,10 +93,16 @@ struct JobEntry {
 using JobList = std::vector<JobEntry>;
 
 void addPrintJobs(JobList& jobs);
+void addPrintTextJobs(JobList& jobs);
 void addScanJobs(JobList& jobs);
 void addReadJobs(JobList& jobs);
 void addWriteJobs(JobList& jobs);
 void addConvertJobs(JobList& jobs);
 void addTranscodeJobs(JobList& jobs);
+void addUnitsJobs(JobList& jobs);
+void addLinesJobs(JobList& jobs);
+void addCallJobs(JobList& jobs);
+void addProgramJobs(JobList& jobs);
+void addScaleJobs(JobList& jobs, std::size_t largest);
 
 }  // namespace bench

@@ -6,6 +6,7 @@
 #include <exception>
 #include <fstream>
 #include <getopt.h>
+#include <iterator>
 #include <stdexcept>
 #include <string>
 
@@ -54,33 +55,42 @@ Options parsed(int argc, char** argv) {
     return options;
 }
 
-JobList allJobs() {
+JobList allJobs(bool quick) {
     JobList jobs;
     addPrintJobs(jobs);
+    addPrintTextJobs(jobs);
     addScanJobs(jobs);
     addReadJobs(jobs);
     addWriteJobs(jobs);
     addConvertJobs(jobs);
     addTranscodeJobs(jobs);
+    addUnitsJobs(jobs);
+    addLinesJobs(jobs);
+    addCallJobs(jobs);
+    addProgramJobs(jobs);
+    addScaleJobs(jobs, quick ? 1000000 : 100000000);
     return jobs;
 }
 
-JobList chosenJobs(const std::vector<std::string>& beginnings) {
-    JobList jobs = allJobs();
-    const auto isBeginning = [](const std::string& name) {
-        return [&name](const std::string& beginning) { return name.starts_with(beginning); };
+// The job of that name, else those that begin with it.
+JobList jobsNamed(const JobList& jobs, const std::string& name) {
+    JobList chosen;
+    const auto take = [&](auto matches) {
+        std::ranges::copy_if(jobs, std::back_inserter(chosen), matches);
     };
-    for (const std::string& beginning : beginnings) {
-        const auto begins = [&](const JobEntry& job) { return job.name.starts_with(beginning); };
-        if (std::ranges::none_of(jobs, begins))
-            throw std::invalid_argument("no job '" + beginning + "'\n" + usage);
-    }
-    if (!beginnings.empty()) {
-        std::erase_if(jobs, [&](const JobEntry& job) {
-            return std::ranges::none_of(beginnings, isBeginning(job.name));
-        });
-    }
-    return jobs;
+    take([&](const JobEntry& job) { return job.name == name; });
+    if (chosen.empty()) take([&](const JobEntry& job) { return job.name.starts_with(name); });
+    if (chosen.empty()) throw std::invalid_argument("no job '" + name + "'\n" + usage);
+    return chosen;
+}
+
+JobList chosenJobs(const Options& options) {
+    const JobList jobs = allJobs(options.quick);
+    if (options.jobs.empty()) return jobs;
+    JobList chosen;
+    for (const std::string& name : options.jobs)
+        std::ranges::move(jobsNamed(jobs, name), std::back_inserter(chosen));
+    return chosen;
 }
 
 void writeFile(const std::string& path, const std::string& text) {
@@ -109,7 +119,7 @@ Rows runJobs(const JobList& jobs, Context& context, int& refused) {
 
 int run(int argc, char** argv) {
     const Options options = parsed(argc, argv);
-    const JobList jobs = chosenJobs(options.jobs);
+    const JobList jobs = chosenJobs(options);
     if (options.list) {
         for (const JobEntry& job : jobs)
             std::puts(job.name.c_str());
