@@ -23,6 +23,11 @@ inline constexpr std::size_t formatPieceBytes = 16;
 inline constexpr std::size_t paddingBlockUnits = 3;
 // The largest chunk, in bytes, that a buffer opens beyond what it was asked for.
 inline constexpr std::size_t reservedChunkBytes = 16;
+// Formatted elements collected before they are written; below the buffer of any file, so that this
+// is written out as it fills, at the same bytes as ever.
+inline constexpr std::size_t elementBlockBytes = 1000;
+// Elements made ready for that at once.
+inline constexpr std::size_t elementSlice = 5;
 #else
 inline constexpr std::size_t transferPieceBytes = 1048576;
 inline constexpr std::size_t conversionPieceBytes = 65536;
@@ -32,6 +37,8 @@ inline constexpr std::size_t numberScratchBytes = 512;
 inline constexpr std::size_t formatPieceBytes = 65536;
 inline constexpr std::size_t paddingBlockUnits = 256;
 inline constexpr std::size_t reservedChunkBytes = 65536;
+inline constexpr std::size_t elementBlockBytes = 4032;
+inline constexpr std::size_t elementSlice = 256;
 #endif
 
 }  // namespace Orvandeil::FileIO::constants

@@ -7,6 +7,7 @@
 #include "fileio/printf/vocabulary.h"
 
 #include <memory>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -44,6 +45,8 @@ public:
     // the stream's code as an int after a short write, std::out_of_range when no piece was taken.
     void printRemainingFormatAsLiteral(TcodnStream* out) const;
 
+    // All pieces of the format, in order.
+    std::span<const std::unique_ptr<foutFormatPiece>> getPieces() const { return pieces; }
     PrintFormatArgumentType getArgumentType() const { return argumentType; }
     // The conversions other than "%%", and the "*" that take the next argument.
     unsigned long getConversionCount() const { return conversionCount; }

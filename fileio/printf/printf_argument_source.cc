@@ -130,6 +130,14 @@ bool printfArgumentSource::isCharacterCode() const {
            detail::isRepresentable<std::uint16_t>(*data, elementIndex);
 }
 
+detail::PlainElements printfArgumentSource::plainElements() const {
+    if (!data || data->getElements() == nullptr || isCurrentArgumentEmpty()) return {};
+    const vxClassID classID = data->getClassID();
+    const auto* elements = static_cast<const char*>(data->getElements());
+    return {classID, elements + elementIndex * fiPkGetSizeFromClassID(classID),
+            argLength - elementIndex};
+}
+
 namespace {
 
 // Whether a conversion to T can show a finite element in its own form.

@@ -13,6 +13,17 @@
 
 namespace Orvandeil::FileIO {
 
+namespace detail {
+
+// A run of elements of one class, as they lie in their array.
+struct PlainElements {
+    vxClassID classID = vxUNKNOWN_CLASS;
+    const char* first = nullptr;
+    std::size_t count = 0;
+};
+
+}  // namespace detail
+
 // Hands the elements of the argument arrays, which it does not own, to conversions: one at a time,
 // in column-major order. Failures are thrown as int codes; errors of element conversions and of an
 // object's "size" are raised as the host's typed errors.
@@ -71,6 +82,12 @@ public:
     // char16_t). Without a current argument it is printable: taking it then fails as it should.
     template <class T>
     Printability checkPrintabilityByType() const;
+
+    // The elements that the current argument still has; none for an object, and none without a
+    // current argument.
+    detail::PlainElements plainElements() const;
+    // Steps past elements that are not the last.
+    void skipElements(std::size_t count) { elementIndex += count; }
 
 protected:
     friend struct LayoutProbe;

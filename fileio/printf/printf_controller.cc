@@ -1,6 +1,9 @@
 #include "fileio/printf/printf_controller.h"
 
 #include "fileio/errors/code_list.h"
+#include "fileio/printf/element_program.h"
+
+#include <optional>
 
 namespace Orvandeil::FileIO {
 namespace {
@@ -13,6 +16,11 @@ std::unique_ptr<printfArgumentSource> makeSource(const PrintFormatParser& parser
     }
     return std::make_unique<printfSequentialArgumentSource>(args, argc);
 }
+
+#ifdef FILEIO_FAST_PATHS
+// Preparing the program costs about as much as printing some elements without it.
+constexpr std::size_t elementsWorthPreparing = 8;
+#endif
 
 }  // namespace
 
@@ -32,18 +40,31 @@ bool printfController::doPrintf() {
     }
 }
 
-// A numbered format is not rewound, so its second pass finds no piece.
 void printfController::printAllPasses() {
-    while (takePiece()) {
-        do {
-            currentPiece->printFormattedOutputToDestination(output, source.get());
-        } while (takePiece());
-        if (!source->hasMoreData()) return;
-        if (parser.getArgumentType() == PrintFormatParser::ArgumentsNone) {
-            throw code::MatchingFailure;
-        }
-        parser.resetParser();
+#ifdef FILEIO_FAST_PATHS
+    std::optional<detail::ElementProgram> program;
+    while (printPass()) {
+        if (source->plainElements().count < elementsWorthPreparing) continue;
+        if (!program) program.emplace(parser.getPieces(), *output);
+        if (program->isUsable()) program->run(*source, currentPiece);
     }
+#else
+    while (printPass()) {
+    }
+#endif
+}
+
+// Whether another pass follows. A numbered format is not rewound, so its second pass finds no
+// piece.
+bool printfController::printPass() {
+    if (!takePiece()) return false;
+    do {
+        currentPiece->printFormattedOutputToDestination(output, source.get());
+    } while (takePiece());
+    if (!source->hasMoreData()) return false;
+    if (parser.getArgumentType() == PrintFormatParser::ArgumentsNone) throw code::MatchingFailure;
+    parser.resetParser();
+    return true;
 }
 
 bool printfController::takePiece() {

@@ -36,6 +36,7 @@ private:
     friend struct LayoutProbe;
 
     void printAllPasses();
+    bool printPass();
     bool takePiece();
 
     int errorCode = 0;

@@ -133,6 +133,7 @@ protected:
 
 private:
     friend struct LayoutProbe;
+    friend class detail::AsciiOutput;
 
     unsigned long readByte(char& byte);
     int peekByte(unsigned char& byte);

@@ -48,6 +48,7 @@ public:
 
 private:
     friend struct LayoutProbe;
+    friend class detail::AsciiOutput;
 
     char* data = nullptr;
     unsigned long capacity = 0;

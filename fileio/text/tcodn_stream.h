@@ -12,6 +12,10 @@
 
 namespace Orvandeil::FileIO {
 
+namespace detail {
+class AsciiOutput;
+}
+
 // A stream that carries text: it decodes the bytes of its encoding into UTF-16 and encodes UTF-16
 // into them, with one ICU converter and ICU's substitution callbacks. Characters beyond the Basic
 // Multilingual Plane are decoded as the single unit U+001A, so that no engine meets surrogates.
@@ -81,6 +85,7 @@ protected:
 
 private:
     friend struct LayoutProbe;
+    friend class detail::AsciiOutput;
     struct Undecoded;
 
     void openConverter(const std::string& name);

@@ -1,0 +1,42 @@
+#pragma once
+
+#include "fileio/printf/decimal_digits.h"
+#include "fileio/printf/number_text.h"
+
+#include <cstring>
+
+namespace Orvandeil::FileIO::detail {
+
+inline constexpr Word128 sixteenBlanks = sixteenZeros / 3 * 2;
+
+// Fills without a loop where it can, and then up to sixteen bytes too far.
+inline char* fillAhead(char* out, char filling, std::size_t count) {
+    if (count > 16) {
+        std::memset(out, filling, count);
+    } else {
+        storeBytes(out, filling == '0' ? sixteenZeros : sixteenBlanks);
+    }
+    return out + count;
+}
+
+// What stands in front of a number's `length` digits: padding and sign, a 0 for none. Knowing the
+// length beforehand saves moving what was just written, which the processor would wait for.
+inline char* openField(char* out, const NumberForm& form, char sign, std::size_t length) {
+    const std::size_t total = length + (sign != 0 ? 1 : 0);
+    const auto width = static_cast<std::size_t>(form.width);
+    const std::size_t padding = total < width && !form.leftJustify ? width - total : 0;
+    if (padding != 0 && !form.zeroFill) out = fillAhead(out, ' ', padding);
+    *out = sign;
+    out += sign != 0 ? 1 : 0;
+    if (padding != 0 && form.zeroFill) out = fillAhead(out, '0', padding);
+    return out;
+}
+
+// What stands behind it.
+inline char* closeField(char* begin, char* end, const NumberForm& form) {
+    const auto length = static_cast<std::size_t>(end - begin);
+    const auto width = static_cast<std::size_t>(form.width);
+    return form.leftJustify && length < width ? fillAhead(end, ' ', width - length) : end;
+}
+
+}  // namespace Orvandeil::FileIO::detail

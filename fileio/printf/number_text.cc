@@ -1,0 +1,194 @@
+#include "fileio/printf/number_text.h"
+
+#include "fileio/printf/number_field.h"
+
+#include <algorithm>
+#include <charconv>
+#include <cmath>
+#include <limits>
+#include <string_view>
+
+namespace Orvandeil::FileIO::detail {
+namespace {
+
+constexpr std::size_t writtenAhead = 40;
+constexpr std::size_t mostIntegerDigits = 22;  // 64 bits in octal
+constexpr std::size_t mostRealDigits = 309;    // before the point
+constexpr std::size_t signPointAndExponent = 8;
+
+bool isReal(char conversion) {
+    return std::strchr("eEfgG", conversion) != nullptr;
+}
+
+char signOf(const NumberForm& form, bool negative) {
+    return negative ? '-' : form.positiveSign;
+}
+
+// The general layout of a whole number: sign, prefix, zeros up to the precision or the width,
+// digits.
+char* writeDigits(char* out, const NumberForm& form, char sign, std::string_view prefix,
+                  std::string_view digits) {
+    const auto wanted = static_cast<std::size_t>(std::max(form.precision, 0));
+    const std::size_t zeros = digits.size() < wanted ? wanted - digits.size() : 0;
+    const std::size_t length = prefix.size() + zeros + digits.size();
+    NumberForm inner = form;
+    if (!prefix.empty() && form.zeroFill) {
+        // The filling goes behind the prefix.
+        out = std::copy(prefix.begin(), prefix.end(), out);
+        inner.width -= static_cast<int>(std::min<std::size_t>(prefix.size(), 2));
+        inner.width = std::max(inner.width, 0);
+        out = openField(out, inner, sign, length - prefix.size());
+    } else {
+        out = openField(out, inner, sign, length);
+        out = std::copy(prefix.begin(), prefix.end(), out);
+    }
+    out = std::fill_n(out, zeros, '0');
+    return std::copy(digits.begin(), digits.end(), out);
+}
+
+int decimalLength(unsigned long value) {
+    int length = 1;
+    for (; value >= 10000; value /= 10000)
+        length += 4;
+    return length + (value >= 10 ? 1 : 0) + (value >= 100 ? 1 : 0) + (value >= 1000 ? 1 : 0);
+}
+
+// Decimal without precision.
+char* writeDecimal(char* out, const NumberForm& form, char sign, unsigned long value) {
+    char* const begin = out;
+    if (value < tenTo8) {
+        const std::uint64_t digits = eightDigits(value);
+        const int leading = std::min(leadingZeroBytes(digits), 7);
+        out = openField(out, form, sign, static_cast<std::size_t>(8 - leading));
+        storeBytes(out, (digits | eightZeros) >> 8 * leading);
+        out += 8 - leading;
+    } else if (value < tenTo16) {
+        const Word128 digits = sixteenDigits(value);
+        const int leading = leadingZeroBytes(digits);
+        out = openField(out, form, sign, static_cast<std::size_t>(16 - leading));
+        storeBytes(out, (digits | sixteenZeros) >> 8 * leading);
+        out += 16 - leading;
+    } else {
+        out = openField(out, form, sign, static_cast<std::size_t>(decimalLength(value)));
+        out = std::to_chars(out, out + mostIntegerDigits, value).ptr;
+    }
+    return closeField(begin, out, form);
+}
+
+std::string_view prefixOf(const NumberForm& form, unsigned long value) {
+    if (!form.alternate || value == 0) return {};
+    return form.conversion == 'x' ? "0x" : form.conversion == 'X' ? "0X" : "";
+}
+
+int hexLength(unsigned long value) {
+    return (static_cast<int>(std::bit_width(value | 1)) + 3) / 4;
+}
+
+char* writeHexDigits(char* out, unsigned long value, bool upper) {
+    const char* const letters = upper ? "0123456789ABCDEF" : "0123456789abcdef";
+    const int count = hexLength(value);
+    for (int i = count; i-- != 0; value >>= 4)
+        out[i] = letters[value & 15];
+    return out + count;
+}
+
+// The eight digits of 32 bits, in either case.
+std::uint64_t eightHexDigits(std::uint64_t value, bool upper) {
+    value = (value & 0xFFFF) | (value & 0xFFFF0000) << 16;
+    value = (value | value << 8) & 0x00FF00FF00FF00FF;
+    value = (value | value << 4) & 0x0F0F0F0F0F0F0F0F;
+    const std::uint64_t letters = (value + 0x0606060606060606) >> 4 & 0x0101010101010101;
+    return __builtin_bswap64(value + eightZeros + letters * (upper ? 7 : 39));
+}
+
+char* writeShortHex(char* out, const NumberForm& form, unsigned long value) {
+    char* const begin = out;
+    const int count = hexLength(value);
+    out = openField(out, form, 0, static_cast<std::size_t>(count));
+    storeBytes(out, eightHexDigits(value, form.conversion == 'X') >> 8 * (8 - count));
+    return closeField(begin, out + count, form);
+}
+
+// Every form of a magnitude.
+char* writeWhole(char* out, const NumberForm& form, char sign, unsigned long value) {
+    char digits[mostIntegerDigits + 1];
+    char* end = digits;
+    if (form.conversion == 'd' || form.conversion == 'u') {
+        end = std::to_chars(digits, std::end(digits), value).ptr;
+    } else if (form.conversion == 'o') {
+        end = std::to_chars(digits, std::end(digits), value, 8).ptr;
+    } else {
+        end = writeHexDigits(digits, value, form.conversion == 'X');
+    }
+    const auto count = static_cast<std::size_t>(end - digits);
+    std::string_view text = {digits, value == 0 && form.precision == 0 ? 0 : count};
+    std::string_view prefix = prefixOf(form, value);
+    const bool zeroInFront = form.precision > static_cast<int>(text.size()) || text == "0";
+    if (form.alternate && form.conversion == 'o' && !zeroInFront) prefix = "0";
+    // An octal prefix is one of the zeros that the filling puts there.
+    if (prefix == "0" && form.zeroFill && static_cast<int>(text.size()) < form.width) prefix = {};
+    char* const begin = out;
+    out = writeDigits(out, form, sign, prefix, text);
+    return closeField(begin, out, form);
+}
+
+}  // namespace
+
+NumberForm makeNumberForm(char conversion, PrintFormatFlags flags, int width, bool hasPrecision,
+                          int precision) {
+    NumberForm form = {};
+    form.conversion = conversion;
+    form.leftJustify = (flags & LeftJustify) != 0;
+    form.alternate = (flags & Alternate) != 0;
+    form.width = width;
+    const bool real = isReal(conversion);
+    if (real || conversion == 'd') {
+        form.positiveSign = (flags & ShowSign) != 0 ? '+' : (flags & SpaceSign) != 0 ? ' ' : '\0';
+    }
+    form.zeroFill = (flags & ZeroPad) != 0 && !form.leftJustify && (real || !hasPrecision);
+    form.precision = hasPrecision ? precision : real ? 6 : -1;
+    const bool general = conversion == 'g' || conversion == 'G';
+    if (general && form.precision == 0) form.precision = 1;
+    constexpr double tooLarge = 9.99e15;
+    form.plainLimit = conversion == 'f' ? tooLarge / std::pow(10.0, form.precision)
+                                        : std::numeric_limits<double>::infinity();
+    form.mostBytes = static_cast<std::size_t>(width + std::max(form.precision, 0)) +
+                     (conversion == 'f' ? mostRealDigits : mostIntegerDigits) +
+                     signPointAndExponent + writtenAhead;
+    return form;
+}
+
+bool isKnownForm(const NumberForm& form) {
+    constexpr int largestField = 128;
+    if (form.width > largestField || form.precision > largestField) return false;
+    const bool general = form.conversion == 'g' || form.conversion == 'G';
+    return !(form.alternate && isReal(form.conversion) && (general || form.precision == 0));
+}
+
+char* writeSigned(char* out, const NumberForm& form, long value) {
+    const char sign = signOf(form, value < 0);
+    const auto bits = static_cast<unsigned long>(value);
+    const unsigned long magnitude = value < 0 ? 0 - bits : bits;
+    if (form.precision < 0) return writeDecimal(out, form, sign, magnitude);
+    return writeWhole(out, form, sign, magnitude);
+}
+
+char* writeUnsigned(char* out, const NumberForm& form, unsigned long value) {
+    if (form.precision < 0 && !form.alternate && form.conversion != 'o') {
+        if (form.conversion == 'u') return writeDecimal(out, form, 0, value);
+        if (value >> 32 == 0) return writeShortHex(out, form, value);
+    }
+    return writeWhole(out, form, 0, value);
+}
+
+char* writeNonFinite(char* out, const NumberForm& form, double value) {
+    NumberForm padded = form;
+    padded.zeroFill = false;
+    const std::string_view text = std::isnan(value) ? "NaN" : "Inf";
+    const char sign = std::isnan(value) ? '\0' : signOf(form, value < 0);
+    char* const begin = out;
+    out = openField(out, padded, sign, text.size());
+    return closeField(begin, std::copy(text.begin(), text.end(), out), padded);
+}
+
+}  // namespace Orvandeil::FileIO::detail

@@ -1,0 +1,101 @@
+#include "fileio/text/ascii_output.h"
+
+#include "fileio/constants.h"
+#include "fileio/streams/file_stream.h"
+#include "fileio/text/output_string_stream.h"
+
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+#include <stdio_ext.h>
+#include <typeinfo>
+
+#ifdef __SSE2__
+#include <emmintrin.h>
+#endif
+
+namespace Orvandeil::FileIO::detail {
+namespace {
+
+bool isBlockBuffered(std::FILE* file) {
+    return __flbf(file) == 0 && __fbufsize(file) > constants::elementBlockBytes;
+}
+
+template <class Stream>
+Stream* exactly(TcodnStream& out) {
+    return typeid(out) == typeid(Stream) ? static_cast<Stream*>(&out) : nullptr;
+}
+
+void widenAscii(const char* text, std::size_t count, char* out) {
+    std::size_t i = 0;
+#ifdef __SSE2__
+    for (; i + 16 <= count; i += 16) {
+        const __m128i bytes = _mm_loadu_si128(reinterpret_cast<const __m128i*>(text + i));
+        const __m128i zero = _mm_setzero_si128();
+        auto* const units = reinterpret_cast<__m128i*>(out + 2 * i);
+        _mm_storeu_si128(units, _mm_unpacklo_epi8(bytes, zero));
+        _mm_storeu_si128(units + 1, _mm_unpackhi_epi8(bytes, zero));
+    }
+#endif
+    for (; i < count; ++i) {
+        const auto unit = static_cast<char16_t>(text[i]);
+        std::memcpy(out + 2 * i, &unit, sizeof unit);
+    }
+}
+
+}  // namespace
+
+bool AsciiOutput::suits(const TcodnStream& out) {
+    if (typeid(out) == typeid(outputStringStream)) return out.utf16 || out.asciiTransparent;
+    if (typeid(out) != typeid(fileStream)) return false;
+    return isBlockBuffered(static_cast<const fileStream&>(out).file);
+}
+
+AsciiOutput::AsciiOutput(TcodnStream& out)
+    : file(exactly<fileStream>(out)),
+      string(exactly<outputStringStream>(out)),
+      unitBytes(string != nullptr && out.utf16 ? sizeof(char16_t) : 1) {}
+
+bool AsciiOutput::keepsAscii() const {
+    return string != nullptr || file->asciiTransparent;
+}
+
+std::size_t AsciiOutput::room() const {
+    if (string == nullptr) return 0;
+    return (string->capacity - static_cast<std::size_t>(string->cursor - string->data)) / unitBytes;
+}
+
+std::size_t AsciiOutput::write(const char* text, std::size_t count) {
+    if (string != nullptr) {
+        // As often as small writes would make it grow, none of which is larger than the block.
+        while (room() < count) {
+            const unsigned long grown = 2 * string->capacity;
+            string->ResizeTo(grown != 0 ? grown : constants::firstOutputBlockBytes);
+        }
+        settle(text, count);
+        return count;
+    }
+    errno = 0;
+    const std::size_t written = std::fwrite(text, 1, count, file->file);
+    if (written == count) {
+        file->bytesWritten += count;
+    } else {
+        file->recordFailure();
+    }
+    return written;
+}
+
+void AsciiOutput::settle(const char* text, std::size_t count) {
+    if (string == nullptr) {
+        file->bytesWritten += count;
+        return;
+    }
+    if (unitBytes == 1) {
+        std::memcpy(string->cursor, text, count);
+    } else {
+        widenAscii(text, count, string->cursor);
+    }
+    string->cursor += count * unitBytes;
+}
+
+}  // namespace Orvandeil::FileIO::detail
