@@ -5,10 +5,8 @@
 #include "fileio/text/tcodn_stream.h"
 
 #include <algorithm>
-#include <cfenv>
 #include <cmath>
 #include <cstring>
-#include <langinfo.h>
 #include <limits>
 #include <utility>
 
@@ -44,11 +42,6 @@ vxClassID widestClass(vxClassID classID) {
     }
 }
 
-// Whether the C library's printf rounds and points as the writers do.
-bool printsAsWriters() {
-    return std::fegetround() == FE_TONEAREST && std::strcmp(nl_langinfo(RADIXCHAR), ".") == 0;
-}
-
 // Padded with zeros on either side where the flag says so.
 char* writeCharacter(char* out, PrintFormatFlags flags, int width, char character) {
     const char filling = (flags & ZeroPad) != 0 ? '0' : ' ';
@@ -74,7 +67,7 @@ ElementProgram::ElementProgram(Pieces formatPieces, TcodnStream& out)
     : pieces(formatPieces), stream(out), output(out), usable(compile()) {}
 
 bool ElementProgram::compile() {
-    if (!AsciiOutput::suits(stream) || !printsAsWriters()) return false;
+    if (!AsciiOutput::suits(stream) || !writesAsPrintf()) return false;
     for (std::size_t i = 0; i < pieces.size(); ++i) {
         const foutFormatPiece& piece = *pieces[i];
         const bool added =
@@ -124,7 +117,7 @@ bool ElementProgram::addConversion(const foutFormatPiece& piece, std::size_t ind
                       : conversion >= ConvE ? Real
                                             : Unsigned;
     if (kind == Character && !output.keepsAscii()) return false;
-    Step step = {kind, form(isSigned ? 'd' : letter), form('e'), piece.getFlags(), {}, 0, index};
+    Step step = {kind, form(letter), form('e'), piece.getFlags(), {}, 0, index};
     if (!isKnownForm(step.form) || !isKnownForm(step.exponent)) return false;
     step.mostBytes = std::max(step.form.mostBytes, step.exponent.mostBytes);
     if (step.mostBytes > largestPiece) return false;

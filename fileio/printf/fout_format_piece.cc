@@ -2,7 +2,9 @@
 
 #include "fileio/constants.h"
 #include "fileio/errors/code_list.h"
+#include "fileio/printf/number_text.h"
 #include "fileio/printf/printf_argument_source.h"
+#include "fileio/text/ascii_output.h"
 #include "fileio/text/known_streams.h"
 #include "fileio/text/tcodn_stream.h"
 
@@ -114,6 +116,10 @@ template void foutFormatPiece::printAs<unsigned long>(TcodnStream*, printfArgume
 // text goes to the left. That difference is kept on purpose.
 template <class T>
 int foutFormatPiece::printValue(TcodnStream* out, T value) const {
+#ifdef FILEIO_FAST_PATHS
+    int result = 0;
+    if (printDirectly(out, value, result)) return result;
+#endif
     const char* const text = variants[variant]->c_str();
     const bool passPrecision = precision.isFromArgument() && !precision.isNegative();
     const int precisionPassed = static_cast<int>(precision.getEffective());
@@ -125,6 +131,30 @@ int foutFormatPiece::printValue(TcodnStream* out, T value) const {
     return passPrecision ? out->printf(text, widthPassed, precisionPassed, value)
                          : out->printf(text, widthPassed, value);
 }
+
+#ifdef FILEIO_FAST_PATHS
+template <class T>
+bool foutFormatPiece::printDirectly(TcodnStream* out, T value, int& result) const {
+    if constexpr (std::is_floating_point_v<T>) {
+        // An object may become such a number.
+        if (!std::isfinite(value)) return false;
+    }
+    const long field = width.getEffective();
+    const long digits = hasPrecision() ? precision.getEffective() : 0;
+    if (std::max(field, digits) > detail::largestField || !detail::AsciiOutput::suits(*out)) {
+        return false;
+    }
+    const bool inExponentForm = variant == Exponent || variant == ExponentNoPrecision;
+    const char letter = inExponentForm ? 'e' : variants[AsParsed]->back();
+    const detail::NumberForm form = detail::makeNumberForm(
+        letter, flags, static_cast<int>(field), hasPrecision(), static_cast<int>(digits));
+    if (!detail::isKnownForm(form) || !detail::writesAsPrintf()) return false;
+    char text[detail::largestNumberBytes];
+    const auto count = static_cast<std::size_t>(detail::writeNumber(text, form, value) - text);
+    result = detail::AsciiOutput(*out).write(text, count) == count ? static_cast<int>(count) : -1;
+    return true;
+}
+#endif
 
 void foutFormatPiece::printAsE(TcodnStream* out, printfArgumentSource* source) {
     useVariant(variant == NoPrecision ? ExponentNoPrecision : Exponent, exponentForm);

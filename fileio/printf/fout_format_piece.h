@@ -107,6 +107,9 @@ private:
     void useVariant(Variant wanted, std::string (*build)(const std::string&));
     template <class T>
     int printValue(TcodnStream* out, T value) const;
+    // What printValue does, without the C library. False when it cannot, and nothing is done.
+    template <class T>
+    bool printDirectly(TcodnStream* out, T value, int& result) const;
 
     static const FieldValidatorT<15, 17, 16, 18, 19> widthValidator;
     static const FieldValidatorT<20, 22, 21, 23, 24> precisionValidator;

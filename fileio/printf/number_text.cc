@@ -3,8 +3,10 @@
 #include "fileio/printf/number_field.h"
 
 #include <algorithm>
+#include <cfenv>
 #include <charconv>
 #include <cmath>
+#include <langinfo.h>
 #include <limits>
 #include <string_view>
 
@@ -16,8 +18,19 @@ constexpr std::size_t mostIntegerDigits = 22;  // 64 bits in octal
 constexpr std::size_t mostRealDigits = 309;    // before the point
 constexpr std::size_t signPointAndExponent = 8;
 
-bool isReal(char conversion) {
-    return std::strchr("eEfgG", conversion) != nullptr;
+constexpr bool isReal(char conversion) {
+    const char lower = static_cast<char>(conversion | 0x20);
+    return lower >= 'e' && lower <= 'g';
+}
+
+constexpr double largestMagnitude = std::numeric_limits<double>::infinity();
+
+// Below it, a value with so many decimals has sixteen digits at most.
+double plainLimitOf(int precision) {
+    constexpr double limits[] = {9.99e15, 9.99e14, 9.99e13, 9.99e12, 9.99e11, 9.99e10,
+                                 9.99e9,  9.99e8,  9.99e7,  9.99e6,  9.99e5,  9.99e4,
+                                 9.99e3,  9.99e2,  9.99e1,  9.99};
+    return precision < static_cast<int>(std::size(limits)) ? limits[precision] : 0;
 }
 
 char signOf(const NumberForm& form, bool negative) {
@@ -137,6 +150,7 @@ char* writeWhole(char* out, const NumberForm& form, char sign, unsigned long val
 NumberForm makeNumberForm(char conversion, PrintFormatFlags flags, int width, bool hasPrecision,
                           int precision) {
     NumberForm form = {};
+    if (conversion == 'i') conversion = 'd';
     form.conversion = conversion;
     form.leftJustify = (flags & LeftJustify) != 0;
     form.alternate = (flags & Alternate) != 0;
@@ -149,9 +163,7 @@ NumberForm makeNumberForm(char conversion, PrintFormatFlags flags, int width, bo
     form.precision = hasPrecision ? precision : real ? 6 : -1;
     const bool general = conversion == 'g' || conversion == 'G';
     if (general && form.precision == 0) form.precision = 1;
-    constexpr double tooLarge = 9.99e15;
-    form.plainLimit = conversion == 'f' ? tooLarge / std::pow(10.0, form.precision)
-                                        : std::numeric_limits<double>::infinity();
+    form.plainLimit = conversion == 'f' ? plainLimitOf(form.precision) : largestMagnitude;
     form.mostBytes = static_cast<std::size_t>(width + std::max(form.precision, 0)) +
                      (conversion == 'f' ? mostRealDigits : mostIntegerDigits) +
                      signPointAndExponent + writtenAhead;
@@ -159,10 +171,13 @@ NumberForm makeNumberForm(char conversion, PrintFormatFlags flags, int width, bo
 }
 
 bool isKnownForm(const NumberForm& form) {
-    constexpr int largestField = 128;
     if (form.width > largestField || form.precision > largestField) return false;
     const bool general = form.conversion == 'g' || form.conversion == 'G';
     return !(form.alternate && isReal(form.conversion) && (general || form.precision == 0));
+}
+
+bool writesAsPrintf() {
+    return std::fegetround() == FE_TONEAREST && std::strcmp(nl_langinfo(RADIXCHAR), ".") == 0;
 }
 
 char* writeSigned(char* out, const NumberForm& form, long value) {

@@ -9,7 +9,7 @@
 namespace Orvandeil::FileIO::detail {
 
 struct NumberForm {
-    char conversion;    // one of d u o x X e E f g G
+    char conversion;    // one of d u o x X e E f g G; an i becomes d
     bool leftJustify;   // -
     bool zeroFill;      // 0, where it counts
     bool alternate;     // #
@@ -27,10 +27,26 @@ NumberForm makeNumberForm(char conversion, PrintFormatFlags flags, int width, bo
 // Whether the writers below know the form.
 bool isKnownForm(const NumberForm& form);
 
+// The largest width or precision of such a form, and the most that one of them takes.
+inline constexpr int largestField = 128;
+inline constexpr std::size_t largestNumberBytes = 640;
+
+// Whether printf rounds and points now as the writers do: to nearest, with '.'.
+bool writesAsPrintf();
+
 // Each writes one number and returns its end; the room is the form's mostBytes.
 char* writeSigned(char* out, const NumberForm& form, long value);
 char* writeUnsigned(char* out, const NumberForm& form, unsigned long value);
 char* writeReal(char* out, const NumberForm& form, double value);  // finite
+inline char* writeNumber(char* out, const NumberForm& form, long value) {
+    return writeSigned(out, form, value);
+}
+inline char* writeNumber(char* out, const NumberForm& form, unsigned long value) {
+    return writeUnsigned(out, form, value);
+}
+inline char* writeNumber(char* out, const NumberForm& form, double value) {
+    return writeReal(out, form, value);
+}
 // "NaN", "Inf" or "-Inf", padded with blanks whatever the form fills with.
 char* writeNonFinite(char* out, const NumberForm& form, double value);
 

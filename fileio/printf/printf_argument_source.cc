@@ -8,6 +8,8 @@
 #include "fileio/host/messages.h"
 #include "fileio/printf/element_range.h"
 
+#include <typeinfo>
+
 namespace Orvandeil::FileIO {
 namespace {
 
@@ -21,12 +23,6 @@ std::vector<std::size_t> objectDimensions(const vxArray* object) {
     return dimensions;
 }
 
-std::vector<std::size_t> dimensionsOf(const vxArray* array) {
-    if (vxArrayClassID(array) == vxOBJECT_CLASS) return objectDimensions(array);
-    const std::size_t* first = vxArrayDimensions(array);
-    return {first, first + vxArrayDimensionCount(array)};
-}
-
 }  // namespace
 
 printfArgumentSource::printfArgumentSource(const vxArray** arguments, std::size_t count)
@@ -35,12 +31,22 @@ printfArgumentSource::printfArgumentSource(const vxArray** arguments, std::size_
 printfArgumentSource::~printfArgumentSource() = default;
 
 void printfArgumentSource::setupArg() {
-    if (data) clearArg();
     elementIndex = 0;
-    if (argIndex >= argc) return;
-    dims = dimensionsOf(args[argIndex]);
+    if (argIndex >= argc) return clearArg();
+    const vxArray* const array = args[argIndex];
+    if (vxArrayClassID(array) == vxOBJECT_CLASS) {
+        clearArg();
+        dims = objectDimensions(array);
+    } else {
+        const std::size_t* const first = vxArrayDimensions(array);
+        dims.assign(first, first + vxArrayDimensionCount(array));
+    }
     argLength = detail::elementCount(dims);
-    data = std::make_unique<VxData>(args[argIndex]);
+    if (data) {
+        *data = VxData(array);
+    } else {
+        data = std::make_unique<VxData>(array);
+    }
 }
 
 void printfArgumentSource::clearArg() {
@@ -107,6 +113,9 @@ std::u16string_view printfArgumentSource::getCurrentArgumentAsString(std::u16str
     }
     const std::size_t remaining = remainingArgumentLength();
     if (!canUsePercentSOptimization()) {
+#ifdef FILEIO_FAST_PATHS
+        if (takeCharacterCodes(out)) return out;
+#endif
         out.reserve(remaining);
         for (std::size_t i = 0; i < remaining && isCharacterCode(); ++i) {
             out += data->getIndexAs<char16_t>(elementIndex);
@@ -124,6 +133,21 @@ std::u16string_view printfArgumentSource::getCurrentArgumentAsString(std::u16str
     consumeArgument();
     return {characters, remaining};
 }
+
+#ifdef FILEIO_FAST_PATHS
+// The run of codes in one go, where every element is followed by the next one.
+bool printfArgumentSource::takeCharacterCodes(std::u16string& out) {
+    if (typeid(*this) != typeid(printfSequentialArgumentSource)) return false;
+    const detail::PlainElements elements = plainElements();
+    if (elements.count == 0) return false;
+    out.resize(elements.count);
+    out.resize(detail::copyCharacterCodes(elements, out.data()));
+    if (out.empty()) return false;
+    skipElements(out.size() - 1);
+    advanceArgument();
+    return true;
+}
+#endif
 
 bool printfArgumentSource::isCharacterCode() const {
     return hasCurrentArg() && !isCurrentArgumentEmpty() &&

@@ -22,6 +22,9 @@ struct PlainElements {
     std::size_t count = 0;
 };
 
+// Copies the leading elements that are character codes, and returns their number.
+std::size_t copyCharacterCodes(const PlainElements& elements, char16_t* out);
+
 }  // namespace detail
 
 // Hands the elements of the argument arrays, which it does not own, to conversions: one at a time,
@@ -102,6 +105,7 @@ protected:
 
 private:
     bool isCharacterCode() const;
+    bool takeCharacterCodes(std::u16string& out);
 };
 
 // All elements of the first argument, then those of the next.

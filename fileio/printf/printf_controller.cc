@@ -33,11 +33,10 @@ printfController::~printfController() = default;
 bool printfController::doPrintf() {
     try {
         printAllPasses();
-        return true;
     } catch (int failure) {
         errorCode = failure;
-        return false;
     }
+    return complete;
 }
 
 void printfController::printAllPasses() {
@@ -57,14 +56,26 @@ void printfController::printAllPasses() {
 // Whether another pass follows. A numbered format is not rewound, so its second pass finds no
 // piece.
 bool printfController::printPass() {
-    if (!takePiece()) return false;
+    complete = !takePiece();
+    if (complete) return false;
     do {
+        if (isOutOfData()) {
+            errorCode = code::NotEnoughArgs;
+            return false;
+        }
         currentPiece->printFormattedOutputToDestination(output, source.get());
     } while (takePiece());
-    if (!source->hasMoreData()) return false;
+    complete = !source->hasMoreData();
+    if (complete) return false;
     if (parser.getArgumentType() == PrintFormatParser::ArgumentsNone) throw code::MatchingFailure;
     parser.resetParser();
     return true;
+}
+
+// What the piece would throw: data that end within the format are too ordinary for that.
+bool printfController::isOutOfData() const {
+    return parser.getArgumentType() == PrintFormatParser::ArgumentsSequential &&
+           currentPiece->consumesData() && !source->hasCurrentArg();
 }
 
 bool printfController::takePiece() {

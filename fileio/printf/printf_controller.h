@@ -37,6 +37,7 @@ private:
 
     void printAllPasses();
     bool printPass();
+    bool isOutOfData() const;
     bool takePiece();
 
     int errorCode = 0;
@@ -44,6 +45,7 @@ private:
     std::unique_ptr<printfArgumentSource> source;
     foutFormatPiece* currentPiece = nullptr;
     TcodnStream* output;
+    bool complete = false;
 };
 
 }  // namespace Orvandeil::FileIO

@@ -120,9 +120,7 @@ char* writeByLibrary(char* out, const NumberForm& form, double value) {
 
 char* writeFixed(char* out, const NumberForm& form, double value) {
     const double magnitude = std::abs(value);
-    if (form.precision >= wordDigits || !(magnitude < form.plainLimit)) {
-        return writeByLibrary(out, form, value);
-    }
+    if (!(magnitude < form.plainLimit)) return writeByLibrary(out, form, value);
     Scaled scaled = {0, true};
     if (magnitude != 0) scaled = scaleAndRound(decompose(magnitude), form.precision);
     if (!scaled.certain) return writeByLibrary(out, form, value);

@@ -45,10 +45,13 @@ void widenAscii(const char* text, std::size_t count, char* out) {
 
 }  // namespace
 
-bool AsciiOutput::suits(const TcodnStream& out) {
-    if (typeid(out) == typeid(outputStringStream)) return out.utf16 || out.asciiTransparent;
-    if (typeid(out) != typeid(fileStream)) return false;
-    return isBlockBuffered(static_cast<const fileStream&>(out).file);
+bool AsciiOutput::suits(TcodnStream& out) {
+    if (exactly<outputStringStream>(out) != nullptr) {
+        out.GetConv(0);
+        return out.utf16 || out.asciiTransparent;
+    }
+    const fileStream* const file = exactly<fileStream>(out);
+    return file != nullptr && isBlockBuffered(file->file);
 }
 
 AsciiOutput::AsciiOutput(TcodnStream& out)

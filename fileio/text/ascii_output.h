@@ -16,9 +16,9 @@ namespace detail {
 class AsciiOutput {
 public:
     // Whether the stream is one that this is true of: a string stream of UTF-16 or of an encoding
-    // that keeps ASCII, or a file behind a buffer larger than any block. Its encoding must be
-    // decided.
-    static bool suits(const TcodnStream& out);
+    // that keeps ASCII, or a file behind a buffer larger than any block. Decides the encoding of a
+    // string stream.
+    static bool suits(TcodnStream& out);
 
     explicit AsciiOutput(TcodnStream& out);
 
