@@ -42,15 +42,6 @@ vxClassID widestClass(vxClassID classID) {
     }
 }
 
-// Padded with zeros on either side where the flag says so.
-char* writeCharacter(char* out, PrintFormatFlags flags, int width, char character) {
-    const char filling = (flags & ZeroPad) != 0 ? '0' : ' ';
-    const std::size_t padding = width > 1 ? static_cast<std::size_t>(width - 1) : 0;
-    if ((flags & LeftJustify) == 0) out = std::fill_n(out, padding, filling);
-    *out++ = character;
-    return (flags & LeftJustify) != 0 ? std::fill_n(out, padding, filling) : out;
-}
-
 // Copies a short text by its whole block, up to sixteen bytes too far.
 char* copyAhead(char* out, const std::string& text) {
     if (text.size() < 16) {
@@ -116,8 +107,9 @@ bool ElementProgram::addConversion(const foutFormatPiece& piece, std::size_t ind
                       : conversion == ConvC ? Character
                       : conversion >= ConvE ? Real
                                             : Unsigned;
-    if (kind == Character && !output.keepsAscii()) return false;
-    Step step = {kind, form(letter), form('e'), piece.getFlags(), {}, 0, index};
+    // The padding of a character is written for itself, and a converter holds half a pair back.
+    if (kind == Character && (!output.keepsUnits() || piece.getWidthValue() > 1)) return false;
+    Step step = {kind, form(letter), form('e'), {}, 0, index};
     if (!isKnownForm(step.form) || !isKnownForm(step.exponent)) return false;
     step.mostBytes = std::max(step.form.mostBytes, step.exponent.mostBytes);
     if (step.mostBytes > largestPiece) return false;
@@ -140,9 +132,9 @@ char* ElementProgram::writeElement(char* out, const Step& step, Element value) {
         case Character:
             if (isWhole<std::uint16_t>(value)) {
                 const auto unit = static_cast<std::uint16_t>(value);
-                return unit < 0x80 ? writeCharacter(out, step.flags, step.form.width,
-                                                    static_cast<char>(unit))
-                                   : nullptr;
+                if (unit >= 0x80) return nullptr;
+                *out = static_cast<char>(unit);
+                return out + 1;
             }
             break;
         case Real:

@@ -39,7 +39,6 @@ private:
         Kind kind;
         NumberForm form;
         NumberForm exponent;  // for what the conversion cannot hold
-        PrintFormatFlags flags;
         std::string behind;
         std::size_t mostBytes;
         std::size_t pieceIndex;

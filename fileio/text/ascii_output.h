@@ -25,6 +25,9 @@ public:
     // Whether text is encoded as its ASCII bytes; what print() writes always is.
     bool keepsAscii() const;
 
+    // Whether UTF-16 units are written as they are.
+    bool keepsUnits() const { return unitBytes == sizeof(char16_t); }
+
     // Writes the block, and returns the bytes that went out: fewer after a failure, which is in
     // the stream's error code. Nothing of them is counted then. Passes on what the host raises when
     // a string's block cannot grow; nothing is written then.
