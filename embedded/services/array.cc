@@ -171,19 +171,18 @@ vxArray* vxCreateCharRow(const char16_t* text, std::size_t length) {
 }
 
 vxArray* vxCreateCellScalar(vxArray* content) {
-    ArrayPtr owned(content);
     auto array = makeBare(vxCELL_CLASS, nameOfClass(vxCELL_CLASS), {1, 1});
-    array->contents.push_back(std::move(owned));
+    array->contents.emplace_back();
+    array->contents.back().reset(content);
     return array.release();
 }
 
 vxArray* vxCreateStructScalar(std::size_t count, const char* const* names, vxArray* const* values) {
-    std::vector<ArrayPtr> contents(count);
-    for (std::size_t i = 0; i < count; ++i)
-        contents[i].reset(values[i]);
     auto array = makeBare(vxSTRUCT_CLASS, nameOfClass(vxSTRUCT_CLASS), {1, 1});
     array->fields.assign(names, names + count);
-    array->contents = std::move(contents);
+    array->contents.resize(count);
+    for (std::size_t i = 0; i < count; ++i)
+        array->contents[i].reset(values[i]);
     return array.release();
 }
 

@@ -189,21 +189,18 @@ vxArray* vxCreateCharRow(const char16_t* text, std::size_t length) {
 }
 
 vxArray* vxCreateCellScalar(vxArray* content) {
-    Array owned(content);
     Array cell = matrix(vxCELL_CLASS, 1, 1);
     cell->elements = vxMemoryAllocateOrRaise(sizeof(vxArray*));
     cell->contentCount = 1;
-    contents(cell.get())[0] = owned.release();
+    contents(cell.get())[0] = content;
     return cell.release();
 }
 
 vxArray* vxCreateStructScalar(std::size_t count, const char* const*, vxArray* const* values) {
-    std::vector<Array> owned(values, values + count);
     Array structure = matrix(vxSTRUCT_CLASS, 1, 1);
     structure->elements = vxMemoryAllocateOrRaise(count * sizeof(vxArray*));
     structure->contentCount = count;
-    for (std::size_t i = 0; i < count; ++i)
-        contents(structure.get())[i] = owned[i].release();
+    std::copy_n(values, count, contents(structure.get()));
     return structure.release();
 }
 

@@ -48,10 +48,14 @@ struct ObjectTarget<char16_t> {
 OwnedArray makeSubscript(std::size_t index) {
     OwnedArray type(vxCreateCharRow(u"()", 2));
     OwnedArray position(vxCreateDoubleScalar(static_cast<double>(index) + 1));
-    OwnedArray subscripts(vxCreateCellScalar(position.release()));
+    OwnedArray subscripts(vxCreateCellScalar(position.get()));
+    static_cast<void>(position.release());
     constexpr std::array<const char*, 2> names = {"type", "subs"};
-    const std::array<vxArray*, 2> values = {type.release(), subscripts.release()};
-    return OwnedArray(vxCreateStructScalar(names.size(), names.data(), values.data()));
+    const std::array<vxArray*, 2> values = {type.get(), subscripts.get()};
+    OwnedArray structure(vxCreateStructScalar(names.size(), names.data(), values.data()));
+    static_cast<void>(type.release());
+    static_cast<void>(subscripts.release());
+    return structure;
 }
 
 // Null when the host has no such element.

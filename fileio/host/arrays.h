@@ -42,11 +42,11 @@ FILEIO_API vxArray* vxCreateDoubleScalar(double value);
 // A new 1 by `length` char array (0 by 0 when `length` is 0). The caller owns it.
 FILEIO_API vxArray* vxCreateCharRow(const char16_t* text, std::size_t length);
 
-// A new 1 by 1 cell array that takes over `content`. The caller owns it.
+// A new 1 by 1 cell array that takes over `content`, unless it raises. The caller owns it.
 FILEIO_API vxArray* vxCreateCellScalar(vxArray* content);
 
-// A new 1 by 1 struct array with `count` fields in the order given. It takes over the values. The
-// caller owns it.
+// A new 1 by 1 struct array with `count` fields in the order given. It takes over the values,
+// unless it raises. The caller owns it.
 FILEIO_API vxArray* vxCreateStructScalar(std::size_t count, const char* const* names,
                                          vxArray* const* values);
 
