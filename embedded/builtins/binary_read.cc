@@ -34,8 +34,8 @@ vxClassID collectedClass(const FileElement& element, vxClassID delivered) {
     return isCopied ? vxUINT8_CLASS : element.classID;
 }
 
-// Reads bytes that cannot be passed over otherwise.
-void readPast(fileStream& stream, unsigned long bytes) {
+// Reads bytes that cannot be passed over otherwise. False when reading fails, unlike at the end.
+bool readPast(fileStream& stream, unsigned long bytes) {
     std::vector<char> piece(std::min(bytes, constants::transferPieceBytes));
     unsigned long wanted = 0;
     unsigned long got = 0;
@@ -44,6 +44,7 @@ void readPast(fileStream& stream, unsigned long bytes) {
         got = stream.GetNElements(wanted, piece.data(), 1);
         bytes -= got;
     }
+    return got == wanted || stream.getErrorCode() == 0;
 }
 
 // One read: blocks of elements with a skip between them, all in one block when nothing is skipped.
@@ -100,8 +101,7 @@ private:
         errno = 0;
         if (fseeko(file.handle.get(), skip, SEEK_CUR) == 0) return true;
         if (errno != ESPIPE) return false;
-        readPast(*file.stream, static_cast<unsigned long>(skip));
-        return true;
+        return readPast(*file.stream, static_cast<unsigned long>(skip));
     }
 
     std::optional<Failure> shortRead() const {

@@ -24,10 +24,10 @@ long wholeOffset(const OpenFile& file, double offset) {
 }
 
 long moved(OpenFile& file, off_t offset, int whence) {
-    if (fseeko(file.handle.get(), offset, whence) != 0) {
-        throw CodeError(file.failure(code::FseekFailed));
-    }
-    return ftello(file.handle.get());
+    const bool isMoved = fseeko(file.handle.get(), offset, whence) == 0;
+    const long position = isMoved ? ftello(file.handle.get()) : -1;
+    if (position < 0) throw CodeError(file.failure(code::FseekFailed));
+    return position;
 }
 
 }  // namespace

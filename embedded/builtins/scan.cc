@@ -120,7 +120,8 @@ ScanResult scan(OpenFile& file, const std::u16string& format, const SizeAttribut
     ScanResult result = scanStream(*file.stream, format, size);
     const bool hasFileError = std::ferror(file.handle.get()) != 0;
     // To literals and scansets any read that brings nothing is the end of the data.
-    const bool isHiddenError = hasFileError && !hadFileError && result.code == 0;
+    const bool isEnd = result.code == 0 || result.code == code::MatchingFailure;
+    const bool isHiddenError = hasFileError && !hadFileError && isEnd;
     if (isHiddenError) result.code = file.stream->getErrorCode();
     if (!isQuietEnd(result.code, hasFileError)) result.failure = file.failure(result.code);
     result.position = positionIn(file);

@@ -10,6 +10,8 @@ namespace Orvandeil::FileIO::embedded {
 struct Line {
     std::u16string text;
     int result = 0;  // 1: ended by one line feed or carriage return, 2: by both, 0: otherwise
+    // What cut the line short, or lost what stands behind it.
+    std::optional<Failure> failure = std::nullopt;
 };
 
 enum class Terminators { Dropped, Kept };
