@@ -32,11 +32,9 @@ TEST(HostMemory, SizesThatNoBlockCanHave) {
     std::memcpy(block, "kept", 5);
     EXPECT_EQ(vxMemoryAllocate(SIZE_MAX), nullptr);
     EXPECT_THROW(vxMemoryAllocateOrRaise(SIZE_MAX), OutOfMemoryError);
-    EXPECT_THROW(vxMemoryAllocateZeroedOrRaise(SIZE_MAX / 4, 8), OutOfMemoryError);
     EXPECT_THROW(vxMemoryReallocateOrRaise(block, SIZE_MAX), OutOfMemoryError);
     EXPECT_STREQ(static_cast<char*>(block), "kept");
     vxMemoryFree(block);
-    EXPECT_THROW(vxCreateNumericMatrix(SIZE_MAX / 2, 3, vxINT8_CLASS, vxREAL), OutOfMemoryError);
     EXPECT_EQ(fileio_tests::raisedBy(vxMemoryRaiseExhausted), "KESTRA:nomem");
 }
 
@@ -60,21 +58,6 @@ TEST(HostMemory, EveryKindOfAllocationCanFail) {
         EXPECT_NO_THROW(allocate());
     }
     vxMemoryFree(block);
-}
-
-TEST(HostMemory, ArraysLoseNothingWhenAnAllocationFails) {
-    const std::size_t before = liveBlockCount();
-    bool failed = true;
-    for (std::size_t n = 1; failed; ++n) {
-        const FailingAllocation failure(n);
-        const std::string raised = fileio_tests::raisedBy([] {
-            copyOf(*makeNumeric(vxDOUBLE_CLASS, {2, 3}, vxCOMPLEX));
-        });
-        failed = failure.happened();
-        EXPECT_EQ(raised, failed ? "KESTRA:nomem" : "");
-        EXPECT_EQ(liveBlockCount(), before);
-        ASSERT_LT(n, 10u);
-    }
 }
 
 }  // namespace

@@ -62,8 +62,6 @@ TEST(FinFormatParser, Pieces) {
         {__LINE__, "%[]a]", "scanset(%[]a]) 4 0"},
         {__LINE__, "%[^]a]b", "scanset(%[^]a]) literal(b) 4 0"},
         {__LINE__, "%*3[a^]]", "scanset(%3[a^])*3 literal(]) 4 0"},
-        {__LINE__, "%[]", "error(%[]) 4 -8"},
-        {__LINE__, "%[^]", "error(%[^]) 4 -8"},
         // Percent signs.
         {__LINE__, "a%%%d", "literal(a%%) integer(%d) 6 0"},
         {__LINE__, "%%a", "literal(%%) literal(a) 4 0"},

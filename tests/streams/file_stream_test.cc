@@ -109,13 +109,6 @@ TEST(FileStream, Rewinds) {
             EXPECT_EQ(opened.read(9), content.substr(taken - back)) << count << ", " << back;
         }
     }
-    OpenedFile opened(file.path());
-    opened.read(2);
-    for (const unsigned long tooFar : {3UL, static_cast<unsigned long>(LONG_MAX), ULONG_MAX}) {
-        EXPECT_FALSE(opened.stream.Rewind(tooFar));
-        EXPECT_EQ(opened.stream.getErrorCode(), EINVAL);
-        EXPECT_EQ(opened.position(), 2);
-    }
 }
 
 TEST(FileStream, PushesBytesBackIntoAPipe) {
