@@ -109,7 +109,7 @@ WIDE_LOOP void everyFourth(const std::uint16_t* __restrict from, std::size_t cou
 WIDE_LOOP void unpack12(const unsigned char* __restrict from, std::size_t pairs,
                         std::uint16_t* __restrict to) {
     for (std::size_t i = 0; i < pairs; ++i) {
-        const unsigned bits = from[3 * i] | from[3 * i + 1] << 8 | from[3 * i + 2] << 16;
+        const int bits = from[3 * i] | from[3 * i + 1] << 8 | from[3 * i + 2] << 16;
         to[2 * i] = static_cast<std::uint16_t>(bits & 0xFFF);
         to[2 * i + 1] = static_cast<std::uint16_t>(bits >> 12);
     }

@@ -125,9 +125,11 @@ std::size_t decodeJapanese(const std::string& bytes, char16_t* out) {
     const char* const end = from + bytes.size();
     while (from != end) {
         const auto lead = static_cast<unsigned char>(*from++);
-        const bool isPair = lead >= 0x80;
-        const unsigned code = isPair ? lead << 8 | static_cast<unsigned char>(*from++) : lead;
-        *out++ = isPair ? tables.units[code] : static_cast<char16_t>(code);
+        if (lead < 0x80) {
+            *out++ = lead;
+        } else {
+            *out++ = tables.units[lead * 256u + static_cast<unsigned char>(*from++)];
+        }
     }
     return static_cast<std::size_t>(out - begin);
 }
