@@ -1,10 +1,39 @@
 #include "fileio/printf/conversion_token.h"
 
+#include <array>
+
 namespace Orvandeil::FileIO::detail {
 namespace {
 
-constexpr std::u16string_view digits = u"0123456789";
-constexpr std::u16string_view leadingDigits = u"123456789";
+// The parts that an ASCII character can belong to.
+enum CharacterSet : unsigned char {
+    Digit = 1,
+    LeadingDigit = 2,
+    Flag = 4,
+    Modifier = 8,
+    ConversionLetter = 16,
+    Star = 32,
+    Point = 64,
+    Sign = 128
+};
+
+constexpr std::array<unsigned char, 128> makeCharacterSets() {
+    std::array<unsigned char, 128> sets{};
+    const auto add = [&sets](std::string_view characters, CharacterSet set) {
+        for (const char character : characters)
+            sets[static_cast<unsigned char>(character)] |= set;
+    };
+    add("0123456789", Digit);
+    add("123456789", LeadingDigit);
+    add("-+ #0", Flag);
+    add("hlbt", Modifier);
+    add("diouxXeEfgGsc%", ConversionLetter);
+    add("*", Star);
+    add(".", Point);
+    add("-", Sign);
+    return sets;
+}
+constexpr std::array<unsigned char, 128> characterSets = makeCharacterSets();
 
 // Takes parts off the front of a text.
 class Taker {
@@ -16,28 +45,27 @@ public:
         rest.remove_prefix(taken.size());
         return taken;
     }
-    std::u16string_view takeAll(std::u16string_view set) { return takeLength(runOf(set, 0)); }
-    std::u16string_view takeOne(std::u16string_view set) {
-        return takeLength(isAt(0, set) ? 1 : 0);
-    }
+    std::u16string_view takeAll(CharacterSet set) { return takeLength(runOf(set, 0)); }
+    std::u16string_view takeOne(CharacterSet set) { return takeLength(isAt(0, set) ? 1 : 0); }
 
     std::u16string_view takeNumbered() { return takeLength(numberedLength(0)); }
     std::u16string_view takeWidth() {
-        if (isAt(0, u"*")) return takeLength(1 + numberedLength(1));
-        return isAt(0, leadingDigits) ? takeAll(digits) : std::u16string_view();
+        if (isAt(0, Star)) return takeLength(1 + numberedLength(1));
+        return isAt(0, LeadingDigit) ? takeAll(Digit) : std::u16string_view();
     }
     std::u16string_view takePrecision() {
-        if (!isAt(0, u".")) return {};
-        if (isAt(1, u"*")) return takeLength(2 + numberedLength(2));
-        const std::size_t sign = isAt(1, u"-") ? 1 : 0;
-        return takeLength(1 + sign + runOf(digits, 1 + sign));
+        if (!isAt(0, Point)) return {};
+        if (isAt(1, Star)) return takeLength(2 + numberedLength(2));
+        const std::size_t sign = isAt(1, Sign) ? 1 : 0;
+        return takeLength(1 + sign + runOf(Digit, 1 + sign));
     }
 
 private:
-    bool isAt(std::size_t offset, std::u16string_view set) const {
-        return offset < rest.size() && set.find(rest[offset]) != set.npos;
+    bool isAt(std::size_t offset, CharacterSet set) const {
+        return offset < rest.size() && rest[offset] < characterSets.size() &&
+               (characterSets[rest[offset]] & set) != 0;
     }
-    std::size_t runOf(std::u16string_view set, std::size_t offset) const {
+    std::size_t runOf(CharacterSet set, std::size_t offset) const {
         std::size_t end = offset;
         while (isAt(end, set))
             ++end;
@@ -45,9 +73,9 @@ private:
     }
     // The length of "digits$" at the offset; without the "$" it is no reference at all.
     std::size_t numberedLength(std::size_t offset) const {
-        if (!isAt(offset, leadingDigits)) return 0;
-        const std::size_t run = runOf(digits, offset);
-        return isAt(offset + run, u"$") ? run + 1 : 0;
+        if (!isAt(offset, LeadingDigit)) return 0;
+        const std::size_t run = runOf(Digit, offset);
+        return offset + run < rest.size() && rest[offset + run] == u'$' ? run + 1 : 0;
     }
 
     std::u16string_view rest;
@@ -64,11 +92,11 @@ ConversionToken tokenizeConversion(std::u16string_view format, std::size_t posit
         return part;
     };
     token.numbered = count(taker.takeNumbered());
-    token.flags = count(taker.takeAll(u"-+ #0"));
+    token.flags = count(taker.takeAll(Flag));
     token.width = count(taker.takeWidth());
     token.precision = count(taker.takePrecision());
-    token.modifier = count(taker.takeOne(u"hlbt"));
-    token.conversion = count(taker.takeOne(u"diouxXeEfgGsc%"));
+    token.modifier = count(taker.takeOne(Modifier));
+    token.conversion = count(taker.takeOne(ConversionLetter));
     token.whole = format.substr(position, length);
     return token;
 }

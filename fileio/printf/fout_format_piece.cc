@@ -59,10 +59,17 @@ foutFormatPiece::foutFormatPiece(const foutFormatPieceInitBlock& init)
       formatPosition(init.formatPosition),
       conversion(init.conversion),
       subformat(init.subformat) {
-    variants[AsParsed] = std::make_unique<std::string>(init.printfFormat);
+    if (conversion != NoConversion) {
+        variants[AsParsed] = std::make_unique<std::string>(init.printfFormat);
+    }
 }
 
 foutFormatPiece::~foutFormatPiece() = default;
+
+const std::string& foutFormatPiece::getPrintfText() const {
+    static const std::string none;
+    return variants[AsParsed] ? *variants[AsParsed] : none;
+}
 
 unsigned long foutFormatPiece::getBufferSize() const {
     return static_cast<unsigned long>(precision.getEffective() + width.getEffective() + 20);

@@ -72,7 +72,8 @@ public:
     int getWidthValue() const { return width.getValue(); }
     WidthPrecisionFieldType getPrecisionKind() const { return precision.getKind(); }
     int getPrecisionValue() const { return precision.getValue(); }
-    const std::string& getPrintfText() const { return *variants[AsParsed]; }
+    // For the C library; empty for a literal.
+    const std::string& getPrintfText() const;
     // Where the piece stands in the format; for a literal in front of a "%", the place of the "%".
     unsigned long getFormatPosition() const { return formatPosition; }
 

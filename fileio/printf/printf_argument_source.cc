@@ -154,6 +154,11 @@ bool printfArgumentSource::isCharacterCode() const {
            detail::isRepresentable<std::uint16_t>(*data, elementIndex);
 }
 
+void printfArgumentSource::skipArguments(std::size_t count) {
+    argIndex += count;
+    setupArg();
+}
+
 detail::PlainElements printfArgumentSource::plainElements() const {
     if (!data || data->getElements() == nullptr || isCurrentArgumentEmpty()) return {};
     const vxClassID classID = data->getClassID();

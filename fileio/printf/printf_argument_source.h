@@ -7,6 +7,7 @@
 
 #include <cstddef>
 #include <memory>
+#include <span>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -89,6 +90,13 @@ public:
     // The elements that the current argument still has; none for an object, and none without a
     // current argument.
     detail::PlainElements plainElements() const;
+    // The arguments from the current one on; none when an element of that one was taken already.
+    std::span<const vxArray* const> wholeArguments() const {
+        if (elementIndex != 0 || argIndex >= argc) return {};
+        return {args + argIndex, argc - argIndex};
+    }
+    // Goes on with a later argument.
+    void skipArguments(std::size_t count);
     // Steps past elements that are not the last.
     void skipElements(std::size_t count) { elementIndex += count; }
 

@@ -2,6 +2,7 @@
 
 #include "fileio/errors/code_list.h"
 #include "fileio/printf/element_program.h"
+#include "fileio/printf/word_program.h"
 
 #include <optional>
 
@@ -18,8 +19,8 @@ std::unique_ptr<printfArgumentSource> makeSource(const PrintFormatParser& parser
 }
 
 #ifdef FILEIO_FAST_PATHS
-// Preparing the program costs about as much as printing some elements without it.
-constexpr std::size_t elementsWorthPreparing = 8;
+// Preparing a program costs about as much as printing so many elements or words without it.
+constexpr std::size_t worthPreparing = 8;
 #endif
 
 }  // namespace
@@ -40,18 +41,33 @@ bool printfController::doPrintf() {
 }
 
 void printfController::printAllPasses() {
-#ifdef FILEIO_FAST_PATHS
-    std::optional<detail::ElementProgram> program;
-    while (printPass()) {
-        if (source->plainElements().count < elementsWorthPreparing) continue;
-        if (!program) program.emplace(parser.getPieces(), *output);
-        if (program->isUsable()) program->run(*source, currentPiece);
-    }
-#else
-    while (printPass()) {
-    }
-#endif
+    if (printPass()) printFurtherPasses();
 }
+
+#ifdef FILEIO_FAST_PATHS
+// Not part of its caller, which would set up the program's block for a single pass too.
+[[gnu::noinline]] void printfController::printFurtherPasses() {
+    const bool sequential = parser.getArgumentType() == PrintFormatParser::ArgumentsSequential;
+    std::optional<detail::ElementProgram> elements;
+    std::optional<detail::WordProgram> words;
+    do {
+        if (!sequential) continue;
+        if (source->wholeArguments().size() >= worthPreparing) {
+            if (!words) words.emplace(parser.getPieces(), *output);
+            if (words->isUsable()) words->run(*source, currentPiece);
+        }
+        if (source->plainElements().count >= worthPreparing) {
+            if (!elements) elements.emplace(parser.getPieces(), *output);
+            if (elements->isUsable()) elements->run(*source, currentPiece);
+        }
+    } while (printPass());
+}
+#else
+void printfController::printFurtherPasses() {
+    while (printPass()) {
+    }
+}
+#endif
 
 // Whether another pass follows. A numbered format is not rewound, so its second pass finds no
 // piece.

@@ -36,6 +36,7 @@ private:
     friend struct LayoutProbe;
 
     void printAllPasses();
+    void printFurtherPasses();
     bool printPass();
     bool isOutOfData() const;
     bool takePiece();

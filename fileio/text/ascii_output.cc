@@ -47,8 +47,7 @@ void widenAscii(const char* text, std::size_t count, char* out) {
 
 bool AsciiOutput::suits(TcodnStream& out) {
     if (exactly<outputStringStream>(out) != nullptr) {
-        out.GetConv(0);
-        return out.utf16 || out.asciiTransparent;
+        return out.writesUnits() || out.asciiTransparent;
     }
     const fileStream* const file = exactly<fileStream>(out);
     return file != nullptr && isBlockBuffered(file->file);

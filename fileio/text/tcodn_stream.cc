@@ -19,6 +19,8 @@ namespace {
 constexpr std::array latinFixedNames = {"ibm-5348_P100-1997", "ibm-943_P15A-2003", "ISO-8859-1",
                                         "US-ASCII"};
 
+constexpr const char* unitEncoding = "UTF-16";
+
 struct StatusCode {
     UErrorCode status;
     int code;
@@ -67,11 +69,21 @@ void TcodnStream::openConverter(const std::string& name) {
 }
 
 UConverter* TcodnStream::GetConv(unsigned long n) {
-    if (!converter) {
-        const std::string detected = DetectCharset(n);
-        openConverter(detected.empty() ? "UTF-8" : detected);
-    }
+    if (!converter) openDetected(utf16 ? unitEncoding : DetectCharset(n));
     return converter;
+}
+
+void TcodnStream::openDetected(const std::string& detected) {
+    openConverter(detected.empty() ? "UTF-8" : detected);
+}
+
+// Opening a converter takes longer than printing a few numbers, and units need none.
+bool TcodnStream::writesUnits() {
+    if (converter || utf16) return utf16;
+    const std::string detected = DetectCharset(0);
+    utf16 = detected == unitEncoding;
+    if (!utf16) openDetected(detected);
+    return utf16;
 }
 
 std::string TcodnStream::GetEncodingName() {

@@ -89,6 +89,9 @@ private:
     struct Undecoded;
 
     void openConverter(const std::string& name);
+    void openDetected(const std::string& detected);
+    // Whether the encoding, now decided, is UTF-16.
+    bool writesUnits();
     Undecoded readUndecoded(unsigned long wanted);
     unsigned long decode(Undecoded& bytes, char16_t* out, unsigned long room);
     unsigned long convert(Undecoded& bytes, char16_t* out, unsigned long room, UConverter* from);

@@ -35,9 +35,8 @@ unsigned long TcodnStream::encode(const char16_t* text, unsigned long n, UErrorC
 
 unsigned long TcodnStream::PutString(const char16_t* text, unsigned long n) {
     if (!text || n == 0) return 0;
-    // Opened before the flag is asked for: else the first write would carry a byte-order mark.
+    if (writesUnits()) return PutNCharacters(n, text);
     const UConverter* const to = GetConv(0);
-    if (utf16) return PutNCharacters(n, text);
     UErrorCode status = U_ZERO_ERROR;
     const unsigned long bytes = encode(text, n, status);
     const unsigned long written = PutNElements(bytes, writeBytes.data(), 1);

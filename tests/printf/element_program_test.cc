@@ -67,6 +67,14 @@ public:
         return array;
     }
 
+    ArrayPtr word() {
+        if (below(100) == 0) return makeScalar(oddNumber());
+        std::u16string text(below(9), u'a');
+        for (char16_t& unit : text)
+            unit = static_cast<char16_t>(below(30) == 0 ? random() : 'a' + below(26));
+        return makeChars(text);
+    }
+
 private:
     std::string literal() {
         static const std::string choices[] = {"",
@@ -91,7 +99,7 @@ private:
         for (const char flag : {'-', '+', ' ', '#', '0'}) {
             if (below(6) == 0) text += flag;
         }
-        const char letter = "ddiouxXeEfgGcs"[below(14)];
+        const char letter = "ddiouxXeEfgGcss"[below(15)];
         const bool isText = letter == 'c' || letter == 's';
         if (below(3) == 0 && (padsText || !isText)) {
             text += std::to_string(below(20) == 0 ? below(200) : 1 + below(25));
@@ -135,8 +143,9 @@ struct Job {
 Job makeJob(Generator& generate) {
     Job job;
     job.format = fileio_tests::toUtf16(generate.format());
-    for (unsigned i = generate.below(3) + 1; i != 0; --i)
-        job.arrays.push_back(generate.array());
+    const bool words = generate.below(4) == 0;
+    for (unsigned i = words ? generate.below(300) : generate.below(3) + 1; i != 0; --i)
+        job.arrays.push_back(words ? generate.word() : generate.array());
     return job;
 }
 

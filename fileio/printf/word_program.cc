@@ -1,0 +1,53 @@
+#include "fileio/printf/word_program.h"
+
+#include "fileio/buffers/host_array.h"
+#include "fileio/printf/fout_format_pieces.h"
+#include "fileio/text/ascii_output.h"
+
+#include <typeinfo>
+
+namespace Orvandeil::FileIO::detail {
+
+WordProgram::WordProgram(Pieces formatPieces, TcodnStream& out)
+    : pieces(formatPieces), string(nullptr) {
+    if (typeid(out) != typeid(outputStringStream) || !AsciiOutput::suits(out)) return;
+    if (AsciiOutput(out).keepsUnits() && compile()) string = static_cast<outputStringStream*>(&out);
+}
+
+bool WordProgram::compile() {
+    std::size_t conversions = 0;
+    for (const auto& piece : pieces) {
+        literals.push_back(literalTextOf(*piece));
+        if (!piece->consumesData()) continue;
+        const bool plain = piece->getConversion() == ConvS &&
+                           piece->getWidthKind() == FieldAbsent &&
+                           piece->getPrecisionKind() == FieldAbsent;
+        if (!plain || ++conversions > 1) return false;
+    }
+    return conversions == 1;
+}
+
+// As the stream would be asked to write it, without asking for its encoding every time.
+void WordProgram::put(std::u16string_view text) const {
+    if (text.empty()) return;
+    string->outputStringStream::PutNElements(text.size(), text.data(), sizeof(char16_t));
+}
+
+void WordProgram::run(printfArgumentSource& source, foutFormatPiece*& current) const {
+    const std::span<const vxArray* const> arguments = source.wholeArguments();
+    std::size_t done = 0;
+    while (done + 1 < arguments.size()) {
+        const vxArray* const array = arguments[done];
+        if (vxArrayClassID(array) != vxCHAR_CLASS) break;
+        const auto* const text = static_cast<const char16_t*>(vxArrayData(array));
+        const std::size_t length = elementCount(array);
+        for (std::size_t i = 0; i < pieces.size(); ++i) {
+            current = pieces[i].get();
+            put(literals[i].empty() ? std::u16string_view(text, length) : literals[i]);
+        }
+        ++done;
+    }
+    if (done != 0) source.skipArguments(done);
+}
+
+}  // namespace Orvandeil::FileIO::detail
