@@ -2,6 +2,7 @@
 
 #include "fileio/buffers/element_conversion.h"
 #include "fileio/printf/fout_format_pieces.h"
+#include "fileio/printf/number_field.h"
 #include "fileio/text/tcodn_stream.h"
 
 #include <algorithm>
@@ -40,6 +41,13 @@ vxClassID widestClass(vxClassID classID) {
         default:
             return vxINT64_CLASS;
     }
+}
+
+char* writeWhole(char* out, const NumberForm& form, long value) {
+    const auto bits = static_cast<std::uint64_t>(value);
+    const std::uint64_t magnitude = value < 0 ? 0 - bits : bits;
+    if (form.bare && magnitude < tenTo8) return writeBare(out, value < 0, magnitude);
+    return writeSigned(out, form, value);
 }
 
 // Copies a short text by its whole block, up to sixteen bytes too far.
@@ -122,7 +130,7 @@ template <class Element>
 char* ElementProgram::writeElement(char* out, const Step& step, Element value) {
     switch (step.kind) {
         case Signed:
-            if (isWhole<long>(value)) return writeSigned(out, step.form, static_cast<long>(value));
+            if (isWhole<long>(value)) return writeWhole(out, step.form, static_cast<long>(value));
             break;
         case Unsigned:
             if (isWhole<unsigned long>(value)) {
@@ -177,29 +185,29 @@ void ElementProgram::runAs(printfArgumentSource& source, vxClassID asClass, std:
     const Step* const begin = steps.data();
     const Step* const end = begin + steps.size();
     const Step* step = begin;
-    cursor = std::copy(front.begin(), front.end(), block.data());
+    const char* const blockEnd = block.data() + block.size();
+    char* out = std::copy(front.begin(), front.end(), block.data());
     blockBegin = {0, 0};
     for (std::size_t done = 0; done < count;) {
         const std::size_t wanted = std::min(count - done, std::size(slice));
         AssignToVoidBuffer(asClass, slice, elements.classID, elements.first + done * elementBytes,
                            wanted);
         for (std::size_t i = 0; i < wanted; ++i) {
-            const auto room = static_cast<std::size_t>(block.data() + block.size() - cursor);
-            if (room < step->mostBytes) flush({step->pieceIndex, done + i});
-            if (char* const written = writeElement(cursor, *step, slice[i])) {
-                cursor = written;
+            const Place here = {step->pieceIndex, done + i};
+            if (static_cast<std::size_t>(blockEnd - out) < step->mostBytes) out = flush(out, here);
+            if (char* const written = writeElement(out, *step, slice[i])) {
+                out = written;
             } else {
-                flush({step->pieceIndex, done + i});
+                out = flush(out, here);
                 printByPiece(*step, source, done + i);
             }
-            cursor = copyAhead(cursor, step->behind);
+            out = copyAhead(out, step->behind);
             if (++step == end) step = begin;
         }
         done += wanted;
     }
     // No further pass begins here.
-    cursor -= front.size();
-    flush({0, count});
+    flush(out - front.size(), {0, count});
     source.skipElements(count - stepped);
 }
 
@@ -212,9 +220,9 @@ void ElementProgram::printByPiece(const Step& step, printfArgumentSource& source
     blockBegin = {(step.pieceIndex + 1) % pieces.size(), stepped};
 }
 
-// Everything collected goes out before anything else can happen.
-void ElementProgram::flush(Place next) {
-    const auto count = static_cast<std::size_t>(cursor - block.data());
+// Everything collected goes out before anything else can happen. Returns where to go on.
+char* ElementProgram::flush(const char* end, Place next) {
+    const auto count = static_cast<std::size_t>(end - block.data());
     std::size_t written = 0;
     try {
         written = output.write(block.data(), count);
@@ -226,8 +234,8 @@ void ElementProgram::flush(Place next) {
         settlePart(written);
         throw stream.getErrorCode();
     }
-    cursor = block.data();
     blockBegin = next;
+    return block.data();
 }
 
 // Leaves what writing piece by piece would have left, of which the last that fits is known.

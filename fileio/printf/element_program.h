@@ -57,7 +57,7 @@ private:
     template <class Element>
     static char* writeElement(char* out, const Step& step, Element value);
     void printByPiece(const Step& step, printfArgumentSource& source, std::size_t element);
-    void flush(Place next);
+    char* flush(const char* end, Place next);
     void settlePart(std::size_t written);
     std::size_t bytesOfPiece(Place place) const;
 
@@ -71,7 +71,6 @@ private:
     std::size_t failedPiece = 0;
     std::size_t stepped = 0;  // the elements that the source has gone past
     bool usable;
-    char* cursor = nullptr;  // in the block, while running
     std::array<char, constants::elementBlockBytes> block;
 };
 

@@ -32,6 +32,17 @@ inline char* openField(char* out, const NumberForm& form, char sign, std::size_t
     return out;
 }
 
+// A whole number below 10^8 without a field around it.
+inline char* writeBare(char* out, bool negative, std::uint64_t magnitude) {
+    const std::uint64_t digits = eightDigits(magnitude);
+    // The highest bit stands for the last digit, which is written also when it is 0.
+    const int leading = leadingZeroBytes(digits | 1UL << 63);
+    *out = '-';
+    out += negative ? 1 : 0;
+    storeBytes(out, (digits | eightZeros) >> 8 * leading);
+    return out + 8 - leading;
+}
+
 // What stands behind it.
 inline char* closeField(char* begin, char* end, const NumberForm& form) {
     const auto length = static_cast<std::size_t>(end - begin);

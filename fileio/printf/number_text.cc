@@ -164,6 +164,7 @@ NumberForm makeNumberForm(char conversion, PrintFormatFlags flags, int width, bo
     const bool general = conversion == 'g' || conversion == 'G';
     if (general && form.precision == 0) form.precision = 1;
     form.plainLimit = conversion == 'f' ? plainLimitOf(form.precision) : largestMagnitude;
+    form.bare = conversion == 'd' && flags == NoFlags && width == 0 && !hasPrecision;
     form.mostBytes = static_cast<std::size_t>(width + std::max(form.precision, 0)) +
                      (conversion == 'f' ? mostRealDigits : mostIntegerDigits) +
                      signPointAndExponent + writtenAhead;
