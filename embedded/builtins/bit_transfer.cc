@@ -1,5 +1,6 @@
 #include "embedded/builtins/bit_transfer.h"
 
+#include "embedded/builtins/unpack_vectors.h"
 #include "embedded/services/array.h"
 #include "embedded/services/element_types.h"
 #include "fileio/constants.h"
@@ -47,7 +48,17 @@ void unpackWide(const FieldRun& run, std::size_t place, unsigned long count, T* 
 template <class T>
 void unpackFields(const FieldRun& run, std::size_t place, unsigned long count, void* target) {
     constexpr int widestNarrow = 57;
-    auto* const out = static_cast<T*>(target);
+    auto* out = static_cast<T*>(target);
+#ifdef FILEIO_VECTOR_UNITS
+    if constexpr (sizeof(T) <= sizeof(std::uint32_t)) {
+        const unsigned long done =
+            detail::hasAvx2() ? unpackVectors(std::span(run.bytes), place, run.layout, count, out)
+                              : 0;
+        place += done * run.stride();
+        count -= done;
+        out += done;
+    }
+#endif
     if (run.layout.bits > widestNarrow) return unpackWide(run, place, count, out);
     if (run.layout.bigEndian) return unpackNarrow<T, true>(run, place, count, out);
     unpackNarrow<T, false>(run, place, count, out);
