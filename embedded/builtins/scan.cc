@@ -16,7 +16,7 @@
 namespace Orvandeil::FileIO::embedded {
 namespace {
 
-constexpr std::size_t usualChunk = 64;
+constexpr std::size_t usualChunk = 4;
 constexpr std::size_t largestChunk = 8388608;
 
 void padWithZeros(OutputBuffer& values, std::size_t missing) {

@@ -9,6 +9,9 @@
 #include <cstdlib>
 
 #include <sys/mman.h>
+#if __has_include(<sys/single_threaded.h>)
+#include <sys/single_threaded.h>
+#endif
 
 namespace Orvandeil::FileIO::embedded {
 namespace {
@@ -16,6 +19,25 @@ namespace {
 constexpr std::size_t largestBlock = PTRDIFF_MAX;
 
 std::atomic<std::size_t> liveBlocks = 0;
+
+bool isSingleThreaded() {
+#if __has_include(<sys/single_threaded.h>)
+    return __libc_single_threaded != 0;
+#else
+    return false;
+#endif
+}
+
+// An atomic addition costs about as much as the allocation that it counts.
+void countBlocks(std::ptrdiff_t change) {
+    const auto added = static_cast<std::size_t>(change);
+    if (isSingleThreaded()) {
+        liveBlocks.store(liveBlocks.load(std::memory_order_relaxed) + added,
+                         std::memory_order_relaxed);
+    } else {
+        liveBlocks += added;
+    }
+}
 
 // Allocations left up to and including the one that fails; 0 while none is to fail.
 std::atomic<std::size_t> allocationsToFailure = 0;
@@ -35,7 +57,7 @@ bool mayAllocate() {
 }
 
 void* counted(void* block) {
-    if (block != nullptr) ++liveBlocks;
+    if (block != nullptr) countBlocks(1);
     return block;
 }
 
@@ -111,7 +133,7 @@ void* vxMemoryReallocateOrRaise(void* block, std::size_t bytes) {
 
 void vxMemoryFree(void* block) noexcept {
     if (block == nullptr) return;
-    --liveBlocks;
+    countBlocks(-1);
     std::free(block);
 }
 

@@ -41,9 +41,14 @@ unsigned long bytesInElements(double count, unsigned long elementSize) {
     vxErrMsgId(KESTRA::legacy_two_part::p64bitsize());
 }
 
+const KESTRA::legacy_two_part::badsize_vx& defaultError() {
+    static const KESTRA::legacy_two_part::badsize_vx error;
+    return error;
+}
+
 }  // namespace
 
-SizeAttribute::SizeAttribute() : NumericAttr(KESTRA::legacy_two_part::badsize_vx()) {}
+SizeAttribute::SizeAttribute() : NumericAttr(defaultError()) {}
 
 SizeAttribute::SizeAttribute(const vxArray* array) : SizeAttribute() {
     Init(array);

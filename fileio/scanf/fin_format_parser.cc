@@ -6,6 +6,7 @@
 #include "fileio/scanf/fin_format_pieces.h"
 
 #include <string>
+#include <utility>
 
 namespace Orvandeil::FileIO {
 namespace {
@@ -133,9 +134,11 @@ finFormatParser::Piece finFormatParser::parseScansetConversion(const Field& fiel
     cursor = findSetEnd(cursor + 1);
     if (*cursor == 0) return recordError(code::InvalidFormat);
     ++cursor;
-    const std::u16string text = takePieceText(field);
+    std::u16string joined;
     return std::make_unique<finFormatPieceCMATCH>(
-        finFormatPieceInitBlock{text, field.width, field.asterisk != nullptr}, open);
+        finFormatPieceInitBlock{takePieceText(field, joined), field.width,
+                                field.asterisk != nullptr},
+        open);
 }
 
 SUB_FORMAT finFormatParser::parseSubFormat() {
@@ -161,14 +164,15 @@ finFormatParser::Piece finFormatParser::parseFormat(SUB_FORMAT sub, const Field&
 
 finFormatParser::Piece finFormatParser::createNewFormatPiece(FORMAT kind, SUB_FORMAT sub,
                                                              const Field& field) {
-    const std::u16string text = takePieceText(field);
+    std::u16string joined;
     return detail::scanConversion(kind).create[static_cast<int>(sub)](
-        {text, field.width, field.asterisk != nullptr});
+        {takePieceText(field, joined), field.width, field.asterisk != nullptr});
 }
 
 finFormatParser::Piece finFormatParser::createLiteralFormatPiece() {
-    const std::u16string text = takePieceText({});
-    return std::make_unique<finFormatPieceLiteral>(finFormatPieceInitBlock{text, 0, false}, input);
+    std::u16string joined;
+    return std::make_unique<finFormatPieceLiteral>(
+        finFormatPieceInitBlock{takePieceText({}, joined), 0, false}, input);
 }
 
 finFormatParser::Piece finFormatParser::parseEndOfFormat(State state) {
@@ -186,17 +190,13 @@ finFormatParser::Piece finFormatParser::recordError(int code) {
     return nullptr;
 }
 
-// The text up to the cursor, where the next piece begins.
-std::u16string finFormatParser::takePieceText(const Field& field) {
-    std::u16string text;
-    if (field.asterisk) {
-        text.assign(pieceStart, field.asterisk);
-        text.append(field.asterisk + 1, cursor);
-    } else {
-        text.assign(pieceStart, cursor);
-    }
-    pieceStart = cursor;
-    return text;
+// The text up to the cursor, where the next piece begins; in `joined` when an asterisk is left out.
+std::u16string_view finFormatParser::takePieceText(const Field& field, std::u16string& joined) {
+    const char16_t* const start = std::exchange(pieceStart, cursor);
+    if (!field.asterisk) return {start, cursor};
+    joined.assign(start, field.asterisk);
+    joined.append(field.asterisk + 1, cursor);
+    return joined;
 }
 
 }  // namespace Orvandeil::FileIO

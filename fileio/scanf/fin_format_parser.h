@@ -6,6 +6,8 @@
 
 #include <memory>
 #include <optional>
+#include <string>
+#include <string_view>
 #include <vector>
 
 namespace Orvandeil::FileIO {
@@ -75,7 +77,7 @@ private:
     Piece parseEndOfFormat(State state);
     Piece recordError(int code);
     void addResultClass(const finFormatPiece& piece);
-    std::u16string takePieceText(const Field& field);
+    std::u16string_view takePieceText(const Field& field, std::u16string& joined);
 
     TcodnStream* input;
     const char16_t* pieceStart;
