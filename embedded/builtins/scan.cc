@@ -11,6 +11,7 @@
 #include <array>
 #include <cstring>
 #include <iterator>
+#include <memory>
 #include <string_view>
 
 namespace Orvandeil::FileIO::embedded {
@@ -79,24 +80,37 @@ std::string encodingWithoutMark(const std::string& name) {
     return std::ranges::find(marked, icuName) == marked.end() ? icuName : icuName + "BE";
 }
 
-// Most texts, in the usual encoding, without a converter; false for any other.
-bool encodeAscii(const std::u16string& text, const std::string& encoding, std::string& bytes) {
-    if (!encoding.empty() && encoding != "UTF-8") return false;
-    char16_t used = 0;
-    for (const char16_t unit : text)
-        used |= unit;
-    if (used >= 0x80) return false;
-    bytes.resize(text.size());
-    std::ranges::transform(text, bytes.begin(),
-                           [](char16_t unit) { return static_cast<char>(unit); });
-    return true;
+#ifdef FILEIO_FAST_PATHS
+struct FreeBytes {
+    void operator()(char* bytes) const noexcept { vxMemoryFree(bytes); }
+};
+using HostBytes = std::unique_ptr<char, FreeBytes>;
+
+// The bytes of a text of ASCII characters, as most are, in the usual encoding, and a NUL; null for
+// any other text. By blocks that stay in the cache.
+HostBytes asciiBytes(std::u16string_view text, const std::string& encoding) {
+    if (!encoding.empty() && encoding != "UTF-8") return nullptr;
+    HostBytes bytes(static_cast<char*>(vxMemoryAllocateOrRaise(text.size() + 1)));
+    char* end = bytes.get();
+    for (std::u16string_view block; !text.empty(); text.remove_prefix(block.size())) {
+        constexpr std::size_t blockUnits = 4096;
+        block = text.substr(0, blockUnits);
+        char16_t used = 0;
+        for (const char16_t unit : block)
+            used |= unit;
+        if (used >= 0x80) return nullptr;
+        end = std::transform(block.begin(), block.end(), end,
+                             [](char16_t unit) { return static_cast<char>(unit); });
+    }
+    *end = 0;
+    return bytes;
 }
+#endif
 
 // Complete with what a stateful encoding ends a text with, which a stream leaves pending.
 std::string encoded(const std::u16string& text, const std::string& encoding) {
-    std::string bytes;
-    if (encodeAscii(text, encoding, bytes)) return bytes;
     outputStringStream encoder(encodingWithoutMark(encoding));
+    std::string bytes;
     const char16_t* next = text.data();
     UErrorCode status;
     do {
@@ -108,6 +122,16 @@ std::string encoded(const std::u16string& text, const std::string& encoding) {
         bytes.append(piece, target);
     } while (status == U_BUFFER_OVERFLOW_ERROR);
     return bytes;
+}
+
+// Positions of the result are UTF-16 units.
+ScanResult scanBytes(const char* bytes, std::size_t count, const std::string& encoding,
+                     const std::u16string& format, const SizeAttribute& size) {
+    inputStringStream stream(bytes, static_cast<long>(count), encoding);
+    ScanResult result = scanStream(stream, format, size);
+    if (!isQuietEnd(result.code, false)) result.failure = Failure{result.code, "text"};
+    result.position = static_cast<long>(stream.getUTF16Position());
+    return result;
 }
 
 }  // namespace
@@ -130,12 +154,12 @@ ScanResult scan(OpenFile& file, const std::u16string& format, const SizeAttribut
 
 ScanResult scanText(const std::u16string& text, const std::string& encoding,
                     const std::u16string& format, const SizeAttribute& size) {
+#ifdef FILEIO_FAST_PATHS
+    if (const HostBytes bytes = asciiBytes(text, encoding))
+        return scanBytes(bytes.get(), text.size(), encoding, format, size);
+#endif
     const std::string bytes = encoded(text, encoding);
-    inputStringStream stream(bytes.c_str(), static_cast<long>(bytes.size()), encoding);
-    ScanResult result = scanStream(stream, format, size);
-    if (!isQuietEnd(result.code, false)) result.failure = Failure{result.code, "text"};
-    result.position = static_cast<long>(stream.getUTF16Position());
-    return result;
+    return scanBytes(bytes.c_str(), bytes.size(), encoding, format, size);
 }
 
 }  // namespace Orvandeil::FileIO::embedded

@@ -141,9 +141,9 @@ inline bool takeExponent(FieldBytes& bytes, long& exponent) {
     ++bytes.next;
     const bool negative = bytes.takeMinus();
     std::uint64_t power = 0;
-    const std::size_t digits = takeDigits(bytes, power);
+    if (takeDigits(bytes, power) - 1 >= 6) return false;
     exponent += negative ? -static_cast<long>(power) : static_cast<long>(power);
-    return digits - 1 < 6;
+    return true;
 }
 
 // Takes a sign, digits with a point, and an exponent; false, with `bytes` used up somehow, when
