@@ -23,7 +23,7 @@ inline std::string bytesOf(std::u16string_view text) {
     return {reinterpret_cast<const char*>(text.data()), 2 * text.size()};
 }
 
-// Any bytes, turned into choices one after another. Used up, they give zeros. They also digest what
+// Any bytes, which the caller keeps, turned into choices one after another. Used up, they give zeros. They also digest what
 // was seen of the tested, so that two builds can be compared.
 class Bytes {
 public:

@@ -107,8 +107,9 @@ void encoding(Bytes& input) {
     const char* const name = anyConverter(input);
     std::u16string text;
     for (std::size_t count = input.below(60); count > 0; --count) {
-        const auto unit = static_cast<char16_t>(input.number(2));
-        text += unit % 2 ? input.of(parts) : std::u16string(1, unit);
+        const bool isPart = input.below(2) == 0;
+        text +=
+            isPart ? input.of(parts) : std::u16string(1, static_cast<char16_t>(input.number(2)));
     }
     const std::string where = name + (" of " + bytesOf(text));
     const std::string bytes = encodedInPieces(input, name, text);

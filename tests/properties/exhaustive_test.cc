@@ -1,0 +1,116 @@
+#include "embedded/services/array.h"
+#include "fileio/host/memory.h"
+#include "fileio/printf/print_format_parser.h"
+#include "fileio/printf/printf_controller.h"
+#include "fileio/scanf/scan_control.h"
+#include "fileio/text/input_string_stream.h"
+#include "fileio/text/output_string_stream.h"
+#include "tests/properties/properties.h"
+
+#include <algorithm>
+#include <bit>
+#include <cmath>
+#include <cstdlib>
+#include <regex>
+#include <string>
+#include <vector>
+
+#include <gtest/gtest.h>
+#include <unicode/ucnv.h>
+
+namespace properties {
+namespace {
+
+using namespace Orvandeil::FileIO;
+
+bool isLong() {
+    return std::getenv("FILEIO_LONG") != nullptr;
+}
+
+// What the two parsers accept, as the grammars have it.
+TEST(Exhaustive, TailsOfOneAndTwoCharactersBehindAPercentSign) {
+    const std::regex output(
+        "([^%]|%%|%[-+ #0]*([1-9][0-9]*|\\*)?"
+        "((\\.(\\*|-?[0-9]*))?([hl]?[diouxX]|[bt][ouxX]|[eEfgGs])|c))*");
+    const std::regex input("([^%]|%%|%\\*?(0*[1-9][0-9]*)?([hl]?[diuxXoefgEG]|[sc]))*");
+    for (unsigned code = 1; code < 256 * 256; ++code) {
+        std::string format = {'%', static_cast<char>(code & 0xFF)};
+        if (code >= 256) format += static_cast<char>(code >> 8);
+        if (format[1] == '\0') continue;
+        std::u16string units;
+        for (const char byte : format)
+            units += static_cast<char16_t>(static_cast<unsigned char>(byte));
+        const PrintFormatParser printed(units, false);
+        finFormatParser scanned(units.c_str(), nullptr);
+        scanned.InitFormatPieces();
+        EXPECT_EQ(printed.getRecordedError(), std::regex_match(format, output) ? 0 : -8) << format;
+        EXPECT_EQ(scanned.getError(), std::regex_match(format, input) ? 0 : -8) << format;
+    }
+}
+
+// Every unit of UTF-16, and every two bytes, by every converter, or by every tenth.
+TEST(Exhaustive, UnitsAndPairsOfBytesOfEveryConverter) {
+    for (int converter = 0; converter < ucnv_countAvailable(); converter += isLong() ? 1 : 10) {
+        const char name = static_cast<char>(converter);
+        std::string units = {name, 59};
+        for (unsigned code = 0; code < 0x10000; ++code) {
+            const char high = static_cast<char>(code >> 8), low = static_cast<char>(code);
+            units.append({1, high, low});
+            if (units.size() >= 2 + 3 * 59 || code == 0xFFFF) {
+                Bytes input(units);
+                encoding(input);
+                units = {name, 59};
+            }
+            if (!isLong() && code % 8 != 0) continue;
+            const std::string pair = {name, '\xFF', 2, high, low};
+            Bytes input(pair);
+            decoding(input);
+        }
+    }
+}
+
+std::string printed(const float* values, std::size_t count) {
+    const embedded::ArrayPtr array = embedded::makeNumeric(vxSINGLE_CLASS, {count, 1});
+    std::copy_n(values, count, static_cast<float*>(embedded::realData(*array)));
+    const vxArray* arguments[] = {array.get()};
+    outputStringStream out("US-ASCII");
+    printfController(u"%.9g\n", &out, arguments, 1).doPrintf();
+    long bytes = 0;
+    out.getPosition(bytes);
+    void* const block = out.transferBuffer();
+    std::string text(static_cast<char*>(block), static_cast<std::size_t>(bytes));
+    vxMemoryFree(block);
+    return text;
+}
+
+// Nine digits tell every single; all of them in a long run, else every 40,009th.
+TEST(Exhaustive, SinglesThroughPrintAndScan) {
+    constexpr std::size_t pieceSize = 1 << 16;
+    const std::uint64_t step = isLong() ? 1 : 40009;
+    std::vector<float> values;
+    for (std::uint64_t bits = 0; bits <= UINT32_MAX; bits += step) {
+        values.push_back(std::bit_cast<float>(static_cast<std::uint32_t>(bits)));
+        if (values.size() != pieceSize && bits + step <= UINT32_MAX) continue;
+        const std::string text = printed(values.data(), values.size());
+        inputStringStream in(text.c_str(), std::ssize(text), "");
+        finFormatParser parser(u"%f", &in);
+        parser.InitFormatPieces();
+        OutputBuffer buffer(parser.getResultClass(), pieceSize, pieceSize, pieceSize);
+        unsigned long count = 0;
+        scanControl(0, true, count, in, parser, buffer).performMainScan();
+        ASSERT_EQ(count, values.size());
+        const auto block = buffer.Transfer();
+        const auto* const found = static_cast<const double*>(block.get());
+        for (std::size_t i = 0; i < count; ++i) {
+            const auto value = static_cast<float>(found[i]);
+            const bool isSame = std::isnan(values[i]) ? std::isnan(value)
+                                                      : std::bit_cast<std::uint32_t>(value) ==
+                                                            std::bit_cast<std::uint32_t>(values[i]);
+            ASSERT_TRUE(isSame) << values[i];
+        }
+        values.clear();
+    }
+}
+
+}  // namespace
+}  // namespace properties
