@@ -6,85 +6,15 @@
 
 #include <gtest/gtest.h>
 
-// Every set of flags, with every width and precision, against the C library's own printf: it is the
-// referee for whatever a number looks like.
-
 using namespace Orvandeil::FileIO::embedded;
 
 namespace {
-
-const char* const widths[] = {"", "1", "7", "30"};
-const char* const precisions[] = {"", ".", ".0", ".3", ".17"};
-
-std::vector<std::string> conversionTexts(const std::string& flagLetters) {
-    std::vector<std::string> texts;
-    for (unsigned set = 0; set < 32; ++set) {
-        std::string flags;
-        for (std::size_t i = 0; i < flagLetters.size(); ++i) {
-            if (set >> i & 1) flags += flagLetters[i];
-        }
-        for (const char* width : widths) {
-            for (const char* precision : precisions)
-                texts.push_back('%' + flags + width + precision);
-        }
-    }
-    return texts;
-}
 
 template <class... Arguments>
 std::string formatted(const std::string& format, Arguments... arguments) {
     std::array<char, 1024> text{};
     std::snprintf(text.data(), text.size(), format.c_str(), arguments...);
     return text.data();
-}
-
-TEST(PrintfOracle, WholeNumbersOfEveryFlagWidthAndPrecision) {
-    const double values[] = {0, -0.0, 7, -7, 123456789, 9007199254740992.0, -9.2233720368547758e18};
-    for (const std::string& text : conversionTexts("-+ #0")) {
-        for (const double value : values) {
-            const ArrayPtr argument = makeScalar(value);
-            for (const std::string conversion : {"d", "i", "u", "o", "x", "X"}) {
-                const bool isSigned = conversion == "d" || conversion == "i";
-                if (!isSigned && value < 0) continue;
-                const std::string format = text + "ll" + conversion;
-                EXPECT_EQ(fileio_tests::print(text + conversion, argument).text,
-                          formatted(format, static_cast<long long>(value)))
-                    << text << conversion << " of " << value;
-            }
-        }
-    }
-}
-
-TEST(PrintfOracle, RealNumbersOfEveryFlagWidthAndPrecision) {
-    const double values[] = {0,
-                             -0.0,
-                             2.5,
-                             -1.0 / 3,
-                             1e100,
-                             std::numeric_limits<double>::max(),
-                             std::numeric_limits<double>::denorm_min()};
-    for (const std::string& text : conversionTexts("-+ #0")) {
-        for (const double value : values) {
-            const ArrayPtr argument = makeScalar(value);
-            for (const char* conversion : {"e", "E", "f", "g", "G"}) {
-                EXPECT_EQ(fileio_tests::print(text + conversion, argument).text,
-                          formatted(text + conversion, value))
-                    << text << conversion << " of " << value;
-            }
-        }
-    }
-}
-
-// A value that a conversion cannot hold is shown in the exponent form of the same flags.
-TEST(PrintfOracle, ExponentFormKeepsFlagsWidthAndPrecision) {
-    for (const std::string& text : conversionTexts("-+ #0")) {
-        const ArrayPtr fraction = makeScalar(-2.5);
-        for (const char* conversion : {"d", "lu", "hX", "o", "s"}) {
-            EXPECT_EQ(fileio_tests::print(text + conversion, fraction).text,
-                      formatted(text + "e", -2.5))
-                << text << conversion;
-        }
-    }
 }
 
 // Each class prints the values it can hold exactly, up to its ends, and nothing ever wraps.

@@ -57,7 +57,9 @@ void precision(Bytes& input) {
     const std::string raised = raisedBy([&] { parsed.Validate(); });
     requireEqual(raised, parsed.valid ? "" : "KESTRA:legacy_two_part:badprecision_vx", text);
     input.observe(raised + describe(parsed));
-    if (!parsed.valid) return;
+    // A target with more behind it is passed over, but may have moved the format.
+    const std::size_t target = text.find("=>");
+    if (!parsed.valid || (target != text.npos && text.find('=', target + 2) != text.npos)) return;
     PrecisionString again;
     again.machineFormat = format;
     again = spelt(parsed).c_str();

@@ -26,7 +26,7 @@ std::string linesOf(fileStream& stream, long max) {
 // The same of a text. At the maximum not even the second half of a pair is taken.
 std::string modelOf(std::u16string_view text, long max) {
     std::string summary;
-    while (!text.empty()) {
+    while (!text.empty() && (max > 0 || max == -1)) {
         const auto limit = static_cast<std::size_t>(max);
         const std::size_t body = std::min({text.find_first_of(u"\r\n"), text.size(), limit});
         const bool isPair = body + 1 < limit && text.substr(body, 2) == u"\r\n";
@@ -46,14 +46,14 @@ void lines(Bytes& input) {
     static const std::u16string parts[] = {u"a",    u"\n",   u"\r",   u"\r\n", u"\u3042", u"é",
                                            u"\x1A", u"xyz ", u"\n\n", u"\x85", u"\u2028", u"\0"};
     const char* const encoding = input.of(statelessEncodings);
-    const long max = input.below(2) == 0 ? -1 : static_cast<long>(1 + input.below(12));
+    const long max = input.below(2) == 0 ? -1 : static_cast<long>(input.below(14)) - 2;
     const std::size_t bufferSize = 1 + input.below(40);
     const bool canSeek = input.below(2) == 0;
     MemoryStream encoder(encoding);
     const std::string runs[] = {"a", "b"};
     for (std::size_t count = input.below(40); count > 0; --count)
         encoder.PutString(input.of(parts));
-    encoder.PutString(std::u16string(input.below(8) == 0 ? input.below(3000) : 0, u'z'));
+    encoder.PutString(std::u16string(input.below(8) == 0 ? input.below(9000) : 0, u'z'));
     const std::string bytes = encoder.output + input.text(runs, 20);
     MemoryStream decoder(encoding, bytes);
     std::u16string text;

@@ -16,9 +16,13 @@ const char* anyConverter(Bytes& input) {
     return ucnv_getAvailableName(static_cast<int>(input.below(count)));
 }
 
+icu::UnicodeString unitsOf(const char* encoding, std::string_view bytes) {
+    return {bytes.data(), static_cast<int>(bytes.size()), encoding};
+}
+
 // ICU over the whole text, then pairs and lone surrogates to one U+001A.
 std::u16string decodedAtOnce(const char* encoding, std::string_view bytes) {
-    const icu::UnicodeString text(bytes.data(), static_cast<int>(bytes.size()), encoding);
+    const icu::UnicodeString text = unitsOf(encoding, bytes);
     std::u16string units(text.getBuffer(), static_cast<std::size_t>(text.length()));
     std::erase_if(units, [](char16_t unit) { return U16_IS_TRAIL(unit); });
     const auto isLead = [](char16_t unit) { return U16_IS_LEAD(unit); };
@@ -37,6 +41,8 @@ std::u16string decodedInSteps(Bytes& input, const char* encoding, std::string_vi
         const unsigned long start = stream.position();
         stream.GetNCodePoints(part, step, &consumed);
         if (consumed != stream.position() - start) throw Broken("miscounted bytes");
+        const auto units = unitsOf(encoding, bytes.substr(0, stream.position())).length();
+        requireEqual(std::to_string(stream.getUTF16Position()), std::to_string(units), encoding);
         all += part;
     } while (part.size() == step);
     requireEqual(std::to_string(stream.position()), std::to_string(bytes.size()), encoding);
@@ -44,15 +50,17 @@ std::u16string decodedInSteps(Bytes& input, const char* encoding, std::string_vi
     return all;
 }
 
-// Writes in pieces of any size.
+// Writes in pieces of any size, one write each.
 std::string encodedInPieces(Bytes& input, const char* encoding, std::u16string_view text) {
     MemoryStream stream(encoding);
-    while (!text.empty()) {
+    int pieces = 0;
+    for (; !text.empty(); ++pieces) {
         const std::size_t length = std::min(1 + input.below(20), text.size());
         stream.PutString(text.substr(0, length));
         text.remove_prefix(length);
     }
     requireEqual(std::to_string(stream.getErrorCode()), "0", encoding);
+    requireEqual(std::to_string(stream.writes), std::to_string(pieces), encoding);
     return stream.output;
 }
 

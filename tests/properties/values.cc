@@ -50,6 +50,14 @@ std::string spelt(const vxArray& array) {
     return text;
 }
 
+// Not-a-number has no sign that is kept.
+std::string shown(const vxArray* array) {
+    std::string text = support::shown(array);
+    for (std::size_t at; (at = text.find("-nan")) != text.npos;)
+        text.erase(at, 1);
+    return text;
+}
+
 }  // namespace
 
 // Any argument is a value or refused, and a value written out is the same value.
@@ -100,7 +108,7 @@ void values(Bytes& input) {
     input.observe(refused + support::shown(array.get()));
     if (!array) return;
     const std::string again = spelt(*array);
-    requireEqual(support::shown(cli::readValue(again).get()), support::shown(array.get()),
+    requireEqual(shown(cli::readValue(again).get()), shown(array.get()),
                  argument + " again as " + again);
 }
 

@@ -12,8 +12,6 @@ namespace Orvandeil::FileIO {
 inline const char* const statelessEncodings[] = {"UTF-8",    "CESU-8",    "Shift_JIS",  "UTF-16LE",
                                                  "UTF-16BE", "GB18030",   "ISO-8859-1", "US-ASCII",
                                                  "EUC-JP",   "Big5-HKSCS"};
-// UTF-16 goes out as it is, and what a text in SCSU becomes depends on how it is cut.
-inline const char* const statefulEncodings[] = {"UTF-32", "ISO-2022-JP", "UTF-7", "SCSU", "UTF-16"};
 
 // Reads a text that the caller keeps, in one read never across `boundary`, and collects what is
 // written up to a limit.

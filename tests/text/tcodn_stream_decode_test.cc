@@ -1,8 +1,6 @@
 #include "tests/support/raised.h"
 #include "tests/text/memory_stream.h"
 
-#include <random>
-
 #include <gtest/gtest.h>
 #include <unicode/unistr.h>
 #include <unicode/utf16.h>
@@ -12,82 +10,14 @@ namespace {
 
 using namespace std::literals;
 
-icu::UnicodeString unitsOf(const char* encoding, std::string_view bytes) {
-    return {bytes.data(), static_cast<int>(bytes.size()), encoding};
-}
-
 // ICU over the whole text, then pairs and lone surrogates to one U+001A.
 std::u16string decodedAtOnce(const char* encoding, std::string_view bytes) {
-    const icu::UnicodeString text = unitsOf(encoding, bytes);
+    const icu::UnicodeString text(bytes.data(), static_cast<int>(bytes.size()), encoding);
     std::u16string units(text.getBuffer(), static_cast<std::size_t>(text.length()));
     std::erase_if(units, [](char16_t unit) { return U16_IS_TRAIL(unit); });
     const auto isLead = [](char16_t unit) { return U16_IS_LEAD(unit); };
     std::replace_if(units.begin(), units.end(), isLead, u'\x1A');
     return units;
-}
-
-// Calls check(encoding, text, repeatable) for random texts of every encoding. The characters of
-// some can be read again; into others bytes are put that belong nowhere.
-template <class Check>
-void forTexts(Check check) {
-    std::mt19937 random(1);
-    const char16_t* const characters[] = {u"a", u"\n", u"é", u"あ", u"ア", u"Ж", u"═", u"😀"};
-    const std::string bytes = "\xE3\x81\xE9\xF0\x9F\xED\xC0\x1B\x8F\x30\xD8\n$\xFF";
-    for (std::size_t round = 0; round < 800; ++round) {
-        const bool isStateless = round % 3 != 0;
-        const char* encoding =
-            isStateless ? statelessEncodings[random() % 10] : statefulEncodings[random() % 5];
-        icu::UnicodeString units;
-        for (std::size_t count = 1 + random() % 6; count > 0; --count)
-            units += characters[random() % std::size(characters)];
-        std::string text(100, '\0');
-        text.resize(
-            static_cast<std::size_t>(units.extract(0, units.length(), text.data(), 100, encoding)));
-        for (std::size_t count = round % 2; count < 4 * (round % 2); ++count)
-            text.insert(random() % (text.size() + 1), 1, bytes[random() % bytes.size()]);
-        check(encoding, text, isStateless && round % 2 == 0);
-    }
-}
-
-// Reads `step` units at once and never bytes across the boundary; with `twice`, every step is given
-// back once and read again.
-std::u16string readInSteps(const char* encoding, const std::string& text, std::size_t boundary,
-                           unsigned long step, bool twice) {
-    MemoryStream stream(encoding, text);
-    stream.boundary = boundary;
-    std::u16string all, part;
-    std::size_t bytes = 0;
-    do {
-        const unsigned long start = stream.position();
-        stream.GetNCodePoints(part, step, &bytes);
-        if (twice) {
-            const std::u16string first = part;
-            stream.Rewind(bytes);
-            stream.GetNCodePoints(part, step, &bytes);
-            EXPECT_EQ(part, first);
-        }
-        EXPECT_EQ(bytes, stream.position() - start);
-        const auto units = unitsOf(encoding, text.substr(0, stream.position())).length();
-        EXPECT_EQ(stream.getUTF16Position(), static_cast<unsigned long>(units));
-        all += part;
-    } while (part.size() == step);
-    EXPECT_EQ(stream.position(), text.size());
-    EXPECT_EQ(stream.getErrorCode(), 0);
-    return all;
-}
-
-TEST(Decoding, DoesNotDependOnWhereTheTextIsCut) {
-    forTexts([](const char* encoding, const std::string& text, bool isRepeatable) {
-        SCOPED_TRACE(encoding + (" " + testing::PrintToString(text)));
-        const std::u16string expected = decodedAtOnce(encoding, text);
-        for (std::size_t boundary = 0; boundary <= text.size(); ++boundary) {
-            for (unsigned long step = 1; step <= text.size() + 1; ++step) {
-                const bool twice = isRepeatable && step == 1 && boundary == 0;
-                EXPECT_EQ(readInSteps(encoding, text, boundary, step, twice), expected)
-                    << "step " << step << ", boundary " << boundary;
-            }
-        }
-    });
 }
 
 std::u16string contents(OutputBuffer& buffer) {

@@ -1,7 +1,6 @@
 #include "tests/text/memory_stream.h"
 
 #include <clocale>
-#include <random>
 
 #include <gtest/gtest.h>
 
@@ -9,43 +8,6 @@ namespace Orvandeil::FileIO {
 namespace {
 
 using namespace std::string_literals;
-
-// A last unit that waits for its partner stays in the converter, as in the stream.
-std::string encodedAtOnce(const char* encoding, const std::u16string& text) {
-    UErrorCode status = U_ZERO_ERROR;
-    UConverter* converter = ucnv_open(encoding, &status);
-    std::string bytes(text.size() * 12 + 16, '\0');
-    char* target = bytes.data();
-    const char16_t* source = text.data();
-    ucnv_fromUnicode(converter, &target, target + bytes.size(), &source, source + text.size(),
-                     nullptr, false, &status);
-    ucnv_close(converter);
-    EXPECT_TRUE(U_SUCCESS(status));
-    bytes.resize(static_cast<std::size_t>(target - bytes.data()));
-    return bytes;
-}
-
-TEST(Encoding, DoesNotDependOnWhereTheTextIsCut) {
-    std::mt19937 random(1);
-    const std::u16string alphabet = u"ab\u00E9\u3042\u30A2\u0416\U0001F600\xD83D\xDE01\xFFFD";
-    for (unsigned round = 0; round < 1210; ++round) {
-        const char* encoding =
-            round % 2 ? statefulEncodings[round / 2 % 3] : statelessEncodings[round / 2 % 10];
-        // The last rounds take texts of which some grow the scratch many times over.
-        std::u16string text(random() % (round < 1200 ? 90 : 100000), u'\0');
-        std::generate(text.begin(), text.end(),
-                      [&] { return alphabet[random() % alphabet.size()]; });
-        MemoryStream stream(encoding);
-        int calls = 0;
-        for (std::size_t n, at = 0; at < text.size(); at += n, ++calls) {
-            n = 1 + random() % (text.size() / 3 + 1);
-            stream.PutString(std::u16string_view(text).substr(at, n));
-        }
-        EXPECT_EQ(stream.output, encodedAtOnce(encoding, text)) << encoding << " " << round;
-        EXPECT_EQ(stream.writes, calls);
-        EXPECT_EQ(stream.getErrorCode(), 0);
-    }
-}
 
 TEST(Encoding, CountsByEncoding) {
     const auto put = [](const char* encoding, std::u16string_view text, std::size_t limit) {
