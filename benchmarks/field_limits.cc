@@ -21,7 +21,8 @@ struct IntegerField {
 
 struct RealField {
     static const char* parse(const char* text, const char* end, double& value) {
-        return std::from_chars(text, end, value).ptr;
+        const char* const behind = std::from_chars(text, end, value).ptr;
+        return behind == text ? end : behind;  // a sign alone, cut off by the end
     }
 };
 

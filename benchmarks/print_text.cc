@@ -131,11 +131,15 @@ void byStream(Trial& trial, const TextInput& input) {
 }
 
 char16_t* copyChecked(const std::u16string& text, char16_t* out) {
+    const char16_t* const from = text.data();
+    const std::size_t count = text.size();
     char16_t all = 0;
-    for (const char16_t unit : text)
-        all |= unit;
+    for (std::size_t i = 0; i < count; ++i) {
+        all |= from[i];
+        out[i] = from[i];
+    }
     if (all > 0x7F) throw std::runtime_error("text is not ASCII");
-    return std::copy(text.begin(), text.end(), out);
+    return out + count;
 }
 
 // Copies to UTF-16 whose characters and numbers are checked to be what they should.
