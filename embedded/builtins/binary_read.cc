@@ -114,7 +114,7 @@ private:
     long skip;
     unsigned long perBlock;
     unsigned long wanted;
-    OutputBuffer& target;
+    [[maybe_unused]] OutputBuffer& target;
     OutputBuffer& buffer;
 };
 
