@@ -50,6 +50,14 @@ char* writeWhole(char* out, const NumberForm& form, long value) {
     return writeSigned(out, form, value);
 }
 
+char* writeWhole(char* out, const NumberForm& form, unsigned long value) {
+    const bool isHex = (form.conversion | 0x20) == 'x';
+    if (form.bare && isHex && value >> 32 == 0) {
+        return writeBareHex(out, value, form.conversion == 'X');
+    }
+    return writeUnsigned(out, form, value);
+}
+
 // Copies a short text by its whole block, up to sixteen bytes too far.
 char* copyAhead(char* out, const std::string& text) {
     if (text.size() < 16) {
@@ -134,7 +142,7 @@ char* ElementProgram::writeElement(char* out, const Step& step, Element value) {
             break;
         case Unsigned:
             if (isWhole<unsigned long>(value)) {
-                return writeUnsigned(out, step.form, static_cast<unsigned long>(value));
+                return writeWhole(out, step.form, static_cast<unsigned long>(value));
             }
             break;
         case Character:

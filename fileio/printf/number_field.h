@@ -43,6 +43,26 @@ inline char* writeBare(char* out, bool negative, std::uint64_t magnitude) {
     return out + 8 - leading;
 }
 
+inline int hexLength(unsigned long value) {
+    return (static_cast<int>(std::bit_width(value | 1)) + 3) / 4;
+}
+
+// The eight digits of 32 bits, in either case.
+inline std::uint64_t eightHexDigits(std::uint64_t value, bool upper) {
+    value = (value & 0xFFFF) | (value & 0xFFFF0000) << 16;
+    value = (value | value << 8) & 0x00FF00FF00FF00FF;
+    value = (value | value << 4) & 0x0F0F0F0F0F0F0F0F;
+    const std::uint64_t letters = (value + 0x0606060606060606) >> 4 & 0x0101010101010101;
+    return __builtin_bswap64(value + eightZeros + letters * (upper ? 7 : 39));
+}
+
+// The digits of 32 bits without a field around them.
+inline char* writeBareHex(char* out, std::uint64_t value, bool upper) {
+    const int count = hexLength(value);
+    storeBytes(out, eightHexDigits(value, upper) >> 8 * (8 - count));
+    return out + count;
+}
+
 // What stands behind it.
 inline char* closeField(char* begin, char* end, const NumberForm& form) {
     const auto length = static_cast<std::size_t>(end - begin);

@@ -93,25 +93,12 @@ std::string_view prefixOf(const NumberForm& form, unsigned long value) {
     return form.conversion == 'x' ? "0x" : form.conversion == 'X' ? "0X" : "";
 }
 
-int hexLength(unsigned long value) {
-    return (static_cast<int>(std::bit_width(value | 1)) + 3) / 4;
-}
-
 char* writeHexDigits(char* out, unsigned long value, bool upper) {
     const char* const letters = upper ? "0123456789ABCDEF" : "0123456789abcdef";
     const int count = hexLength(value);
     for (int i = count; i-- != 0; value >>= 4)
         out[i] = letters[value & 15];
     return out + count;
-}
-
-// The eight digits of 32 bits, in either case.
-std::uint64_t eightHexDigits(std::uint64_t value, bool upper) {
-    value = (value & 0xFFFF) | (value & 0xFFFF0000) << 16;
-    value = (value | value << 8) & 0x00FF00FF00FF00FF;
-    value = (value | value << 4) & 0x0F0F0F0F0F0F0F0F;
-    const std::uint64_t letters = (value + 0x0606060606060606) >> 4 & 0x0101010101010101;
-    return __builtin_bswap64(value + eightZeros + letters * (upper ? 7 : 39));
 }
 
 char* writeShortHex(char* out, const NumberForm& form, unsigned long value) {
@@ -164,7 +151,7 @@ NumberForm makeNumberForm(char conversion, PrintFormatFlags flags, int width, bo
     const bool general = conversion == 'g' || conversion == 'G';
     if (general && form.precision == 0) form.precision = 1;
     form.plainLimit = conversion == 'f' ? plainLimitOf(form.precision) : largestMagnitude;
-    form.bare = conversion == 'd' && flags == NoFlags && width == 0 && !hasPrecision;
+    form.bare = !real && flags == NoFlags && width == 0 && !hasPrecision;
     form.mostBytes = static_cast<std::size_t>(width + std::max(form.precision, 0)) +
                      (conversion == 'f' ? mostRealDigits : mostIntegerDigits) +
                      signPointAndExponent + writtenAhead;

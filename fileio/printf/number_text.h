@@ -14,7 +14,7 @@ struct NumberForm {
     bool zeroFill;      // 0, where it counts
     bool alternate;     // #
     char positiveSign;  // '+', ' ' or none (0)
-    bool bare;          // d and nothing else
+    bool bare;          // a whole number's letter and nothing else
     int width;
     int precision;          // negative: none (whole numbers only)
     double plainLimit;      // magnitudes from here on are left to the standard library

@@ -4,6 +4,7 @@
 #include "fileio/printf/fout_format_pieces.h"
 #include "fileio/text/ascii_output.h"
 
+#include <cstring>
 #include <typeinfo>
 
 namespace Orvandeil::FileIO::detail {
@@ -18,6 +19,7 @@ bool WordProgram::compile() {
     std::size_t conversions = 0;
     for (const auto& piece : pieces) {
         literals.push_back(literalTextOf(*piece));
+        literalUnits += literals.back().size();
         if (!piece->consumesData()) continue;
         const bool plain = piece->getConversion() == ConvS &&
                            piece->getWidthKind() == FieldAbsent &&
@@ -33,7 +35,20 @@ void WordProgram::put(std::u16string_view text) const {
     string->outputStringStream::PutNElements(text.size(), text.data(), sizeof(char16_t));
 }
 
+void WordProgram::copyPass(std::u16string_view word, char16_t* out) const {
+    for (const std::u16string_view literal : literals) {
+        const std::u16string_view text = literal.empty() ? word : literal;
+        if (text.size() == 1) {
+            *out = text.front();
+        } else if (!text.empty()) {
+            std::memcpy(out, text.data(), text.size() * sizeof(char16_t));
+        }
+        out += text.size();
+    }
+}
+
 void WordProgram::run(printfArgumentSource& source, foutFormatPiece*& current) const {
+    AsciiOutput output(*string);
     const std::span<const vxArray* const> arguments = source.wholeArguments();
     std::size_t done = 0;
     while (done + 1 < arguments.size()) {
@@ -41,9 +56,13 @@ void WordProgram::run(printfArgumentSource& source, foutFormatPiece*& current) c
         if (vxArrayClassID(array) != vxCHAR_CLASS) break;
         const auto* const text = static_cast<const char16_t*>(vxArrayData(array));
         const std::size_t length = elementCount(array);
-        for (std::size_t i = 0; i < pieces.size(); ++i) {
-            current = pieces[i].get();
-            put(literals[i].empty() ? std::u16string_view(text, length) : literals[i]);
+        if (char16_t* const out = output.takeUnits(length + literalUnits)) {
+            copyPass({text, length}, out);
+        } else {
+            for (std::size_t i = 0; i < pieces.size(); ++i) {
+                current = pieces[i].get();
+                put(literals[i].empty() ? std::u16string_view(text, length) : literals[i]);
+            }
         }
         ++done;
     }

@@ -29,9 +29,11 @@ public:
 private:
     bool compile();
     void put(std::u16string_view text) const;
+    void copyPass(std::u16string_view word, char16_t* out) const;
 
     Pieces pieces;
     std::vector<std::u16string_view> literals;  // by piece; empty for the conversion
+    std::size_t literalUnits = 0;
     outputStringStream* string;
 };
 

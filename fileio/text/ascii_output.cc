@@ -9,6 +9,7 @@
 #include <cstring>
 #include <stdio_ext.h>
 #include <typeinfo>
+#include <utility>
 
 #ifdef __SSE2__
 #include <emmintrin.h>
@@ -54,8 +55,8 @@ bool AsciiOutput::suits(TcodnStream& out) {
 }
 
 AsciiOutput::AsciiOutput(TcodnStream& out)
-    : file(exactly<fileStream>(out)),
-      string(exactly<outputStringStream>(out)),
+    : string(exactly<outputStringStream>(out)),
+      file(string != nullptr ? nullptr : exactly<fileStream>(out)),
       unitBytes(string != nullptr && out.utf16 ? sizeof(char16_t) : 1) {}
 
 bool AsciiOutput::keepsAscii() const {
@@ -65,6 +66,12 @@ bool AsciiOutput::keepsAscii() const {
 std::size_t AsciiOutput::room() const {
     if (string == nullptr) return 0;
     return (string->capacity - static_cast<std::size_t>(string->cursor - string->data)) / unitBytes;
+}
+
+char16_t* AsciiOutput::takeUnits(std::size_t count) {
+    if (room() < count) return nullptr;
+    return reinterpret_cast<char16_t*>(
+        std::exchange(string->cursor, string->cursor + count * sizeof(char16_t)));
 }
 
 std::size_t AsciiOutput::write(const char* text, std::size_t count) {

@@ -33,6 +33,10 @@ public:
     // a string's block cannot grow; nothing is written then.
     std::size_t write(const char* text, std::size_t count);
 
+    // The place for so many units more of a string's block, which then count as written; null, and
+    // nothing is done, when it has to grow for them.
+    char16_t* takeUnits(std::size_t count);
+
     // The bytes that still fit into a string's block.
     std::size_t room() const;
 
@@ -41,8 +45,8 @@ public:
     void settle(const char* text, std::size_t count);
 
 private:
-    fileStream* file;
     outputStringStream* string;
+    fileStream* file;
     std::size_t unitBytes;
 };
 
