@@ -11,6 +11,8 @@ namespace Orvandeil::FileIO::constants {
 inline constexpr std::size_t transferPieceBytes = 64;
 // Bytes of elements that are swapped and converted while they stay in the processor's cache.
 inline constexpr std::size_t conversionPieceBytes = 32;
+// Bytes of a long text that pass through memory at once.
+inline constexpr std::size_t decodePieceBytes = 24;
 // Bytes decoded, and UTF-16 bytes encoded, by one converter call.
 inline constexpr std::size_t converterPieceBytes = 48;
 // First block of a string output stream, in bytes. Callers may rely on it, so it never shrinks.
@@ -31,6 +33,7 @@ inline constexpr std::size_t elementSlice = 5;
 #else
 inline constexpr std::size_t transferPieceBytes = 1048576;
 inline constexpr std::size_t conversionPieceBytes = 65536;
+inline constexpr std::size_t decodePieceBytes = 65536;
 inline constexpr std::size_t converterPieceBytes = 0x3FFFFFFF;
 inline constexpr std::size_t firstOutputBlockBytes = 1024;
 inline constexpr std::size_t numberScratchBytes = 512;

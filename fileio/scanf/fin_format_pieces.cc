@@ -2,8 +2,10 @@
 
 #include "fileio/errors/code_list.h"
 #include "fileio/host/text.h"
+#include "fileio/text/units_ahead.h"
 
 #include <algorithm>
+#include <limits>
 
 #include <unicode/utf16.h>
 
@@ -63,6 +65,9 @@ unsigned long finFormatPieceCMATCH::scan(TcodnStream& input, OutputBuffer& resul
                                          bool /*hostFlag*/, bool& failed, int& status) {
     bool matched = false;
     for (; width != 0; width -= width > 0 ? 1 : 0) {
+#ifdef FILEIO_FAST_PATHS
+        if (takeMatches(input, result, matched)) break;
+#endif
         std::size_t bytes = 0;
         if (input.GetNCodePoints(oneChar, 1, &bytes) == 0) {
             if (!matched) return fail(0, failed, status);
@@ -78,6 +83,36 @@ unsigned long finFormatPieceCMATCH::scan(TcodnStream& input, OutputBuffer& resul
     if (!matched) return fail(code::MatchingFailure, failed, status);
     return suppress ? 0 : 1;
 }
+
+#ifdef FILEIO_FAST_PATHS
+// Takes what it can of the matches, in memory that is there: only a character read by itself asks
+// for more. True when there are no more of them.
+bool finFormatPieceCMATCH::takeMatches(TcodnStream& input, OutputBuffer& result, bool& matched) {
+    using Verdict = detail::UnitsAhead::Verdict;
+    std::size_t room = suppress ? std::numeric_limits<int>::max() : result.getFreeRoom();
+    if (width > 0) room = std::min(room, static_cast<std::size_t>(width));
+    if (room == 0 || (!suppress && result.GetClassID() != vxCHAR_CLASS)) return false;
+    if (!asciiAnswersKnown) answerForAscii();
+    auto* const begin = suppress ? nullptr : static_cast<char16_t*>(result.Allocate(room));
+    std::size_t taken = 0;
+    const bool ended = detail::UnitsAhead(input).takeWhile([&](char16_t unit) {
+        if (!(unit < asciiAnswers.size() ? asciiAnswers[unit] : accepts(unit)))
+            return Verdict::GiveBack;
+        if (begin) begin[taken] = unit;
+        return ++taken == room ? Verdict::TakeLast : Verdict::Take;
+    });
+    if (begin) result.SetLastChunkSize(taken);
+    if (taken != 0) matched = true;
+    if (width > 0) width -= static_cast<int>(taken);
+    return width == 0 || (ended && taken < room);
+}
+
+void finFormatPieceCMATCH::answerForAscii() {
+    for (char16_t unit = 0; unit < asciiAnswers.size(); ++unit)
+        asciiAnswers[unit] = accepts(unit);
+    asciiAnswersKnown = true;
+}
+#endif
 
 // Where a range could begin with a "-" or behind another range, it does: only a "-" directly before
 // the closing bracket ends no range.

@@ -3,6 +3,8 @@
 #include "fileio/scanf/fin_format_piece.h"
 #include "fileio/scanf/fin_format_piece_t.h"
 
+#include <bitset>
+
 namespace Orvandeil::FileIO {
 
 // What the pieces of text have in common: characters are the values that they produce.
@@ -49,8 +51,12 @@ private:
     friend struct LayoutProbe;
 
     bool accepts(char16_t character) const;
+    bool takeMatches(TcodnStream& input, OutputBuffer& result, bool& matched);
+    void answerForAscii();
 
     std::size_t open;
+    bool asciiAnswersKnown = false;
+    std::bitset<0x80> asciiAnswers;
 };
 
 // Text that the input must repeat. A blank stands for any number of blanks, "%%" for a "%".

@@ -134,12 +134,14 @@ protected:
 private:
     friend struct LayoutProbe;
     friend class detail::AsciiOutput;
+    friend class detail::UnitsAhead;
 
     unsigned long readByte(char& byte);
     int peekByte(unsigned char& byte);
     std::size_t roomForRead(OutputBuffer& buffer, unsigned long elementSize,
                             bool lastCameShort) const;
     unsigned long readInto(OutputBuffer& buffer, std::size_t& room, unsigned long elementSize);
+    long takeOfLine(long limit, OutputBuffer& out, int& result);
     int completeTerminator(char16_t terminator, OutputBuffer& out);
     void beginScan();
     detail::IntegerField scanField(const detail::IntegerScan& operation, long width, int& status);

@@ -1,4 +1,9 @@
 #include "fileio/streams/file_stream.h"
+#include "fileio/text/units_ahead.h"
+
+#include <algorithm>
+#include <cstring>
+#include <string_view>
 
 namespace Orvandeil::FileIO {
 namespace {
@@ -11,6 +16,17 @@ void append(OutputBuffer& out, char16_t unit) {
     *static_cast<char16_t*>(out.Allocate(room)) = unit;
 }
 
+#ifdef FILEIO_FAST_PATHS
+// The bytes before the first line feed or carriage return, if there is any.
+std::size_t lengthOfBody(std::string_view bytes) {
+    const void* const feed = std::memchr(bytes.data(), lineFeed, bytes.size());
+    if (feed) bytes = {bytes.data(), static_cast<const char*>(feed)};
+    const void* const carriage = std::memchr(bytes.data(), carriageReturn, bytes.size());
+    if (carriage) bytes = {bytes.data(), static_cast<const char*>(carriage)};
+    return bytes.size();
+}
+#endif
+
 }  // namespace
 
 int fileStream::GetLine(long maxCharacters, OutputBuffer& out) {
@@ -19,15 +35,54 @@ int fileStream::GetLine(long maxCharacters, OutputBuffer& out) {
     int result = 0;
     long count = 0;
     char16_t unit = 0;
-    while (result == 0 && count != maxCharacters && GetNCodePoints(&unit, 1, nullptr) != 0) {
+    const auto isWanting = [&] { return result == 0 && count != maxCharacters; };
+    while (isWanting()) {
+#ifdef FILEIO_FAST_PATHS
+        count += takeOfLine(maxCharacters - count, out, result);
+        if (!isWanting()) break;
+#endif
+        if (GetNCodePoints(&unit, 1, nullptr) == 0) break;
         append(out, unit);
         ++count;
         if (unit != lineFeed && unit != carriageReturn) continue;
         result = count == maxCharacters ? 1 : completeTerminator(unit, out);
     }
-    if (count != 0) checkForEndOfFile();
+    if (count != 0 && detail::bytesReadAhead(file).empty()) checkForEndOfFile();
     return result;
 }
+
+#ifdef FILEIO_FAST_PATHS
+// Takes the units of a line that need neither more bytes nor more memory nor the converter, at most
+// `limit` unless negative, and the terminator with it if that is clear without reading on. Returns
+// their number.
+long fileStream::takeOfLine(long limit, OutputBuffer& out, int& result) {
+    detail::UnitsAhead ahead(*this);
+    const detail::DirectForm form = ahead.form();
+    std::size_t room = out.getFreeRoom();
+    if (limit > 0) room = std::min(room, static_cast<std::size_t>(limit));
+    if (room == 0 || !detail::isAsciiTransparent(form)) return 0;
+    const std::string_view bytes = ahead.bytes();
+    const char* const end = bytes.data() + bytes.size();
+    auto* const units = static_cast<char16_t*>(out.Allocate(room));
+    const std::size_t body = lengthOfBody(bytes);
+    auto [taken, made] = detail::decodeDirectly(form, nullptr, bytes.data(), body, units, room);
+    const char* next = bytes.data() + taken;
+    std::size_t givenBack = 0;
+    // The terminator, what follows it, and room for both.
+    if (taken == body && end - next >= 2 && room - made >= 2) {
+        char16_t following = 0;
+        givenBack = ahead.decodeUnit(form, next + 1, end, following);
+        if (givenBack != 0) result = 1;
+        if (*next == carriageReturn && following == lineFeed) result = 2;
+        if (result == 2) givenBack = 0;
+        for (int i = 0; i < result; ++i)
+            units[made++] = static_cast<unsigned char>(*next++);
+    }
+    out.SetLastChunkSize(made);
+    ahead.take(bytes.data(), next, givenBack);
+    return static_cast<long>(made);
+}
+#endif
 
 // Reads what follows a terminator: the second half of a pair stays, anything else goes back.
 int fileStream::completeTerminator(char16_t terminator, OutputBuffer& out) {

@@ -58,6 +58,7 @@ public:
 
 private:
     friend struct LayoutProbe;
+    friend class detail::UnitsAhead;
 
     unsigned long countUTF16(const char* next);
     std::optional<std::string_view> numberText(long width, int& status);

@@ -4,6 +4,7 @@
 #include "fileio/errors/identifiers.h"
 #include "fileio/host/messages.h"
 #include "fileio/host/text.h"
+#include "fileio/text/direct_transcoding.h"
 
 #include <algorithm>
 #include <array>
@@ -95,8 +96,17 @@ void TcodnStream::SetEncodingSpecificFlags() {
     latinFixed = std::any_of(latinFixedNames.begin(), latinFixedNames.end(),
                              [name](const char* latin) { return sameName(name, latin); });
     utf16 = sameName(name, "UTF-16");
-    const UConverterType type = ucnv_getType(converter);
-    asciiTransparent = type == UCNV_UTF8 || type == UCNV_LATIN_1 || type == UCNV_US_ASCII;
+    directForm = detail::directFormOf(converter);
+    asciiTransparent = detail::isAsciiTransparent(directForm);
+    byteTable = nullptr;
+}
+
+// Looked for where it is needed first: opening an encoding shall be quick.
+const detail::ByteTable* TcodnStream::tableOfConverter() {
+    if (directForm == detail::DirectForm::Table && !byteTable) {
+        byteTable = &detail::ByteTable::of(converter);
+    }
+    return byteTable;
 }
 
 void TcodnStream::CheckStatus(UErrorCode status) {

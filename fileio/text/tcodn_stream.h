@@ -14,7 +14,10 @@ namespace Orvandeil::FileIO {
 
 namespace detail {
 class AsciiOutput;
-}
+class ByteTable;
+class UnitsAhead;
+enum class DirectForm : unsigned char;
+}  // namespace detail
 
 // A stream that carries text: it decodes the bytes of its encoding into UTF-16 and encodes UTF-16
 // into them, with one ICU converter and ICU's substitution callbacks. Characters beyond the Basic
@@ -86,6 +89,7 @@ protected:
 private:
     friend struct LayoutProbe;
     friend class detail::AsciiOutput;
+    friend class detail::UnitsAhead;
     struct Undecoded;
 
     void openConverter(const std::string& name);
@@ -95,8 +99,14 @@ private:
     Undecoded readUndecoded(unsigned long wanted);
     unsigned long decode(Undecoded& bytes, char16_t* out, unsigned long room);
     unsigned long convert(Undecoded& bytes, char16_t* out, unsigned long room, UConverter* from);
+    bool readsInPieces() const;
+    bool takeWord(OutputBuffer& buffer, long width, long& count);
+    bool takeBlanks();
     unsigned long decodeInto(OutputBuffer& buffer, std::size_t& room, std::size_t& bytesConsumed);
+    unsigned long convertDirectly(Undecoded& bytes, char16_t* out, unsigned long room);
     unsigned long encode(const char16_t* text, unsigned long n, UErrorCode& status);
+    void encodeDirectly(const char16_t*& text, const char16_t* textEnd, std::size_t& used);
+    const detail::ByteTable* tableOfConverter();
 
     UConverter* converter = nullptr;
     bool latinFixed = false;  // an encoding whose units are taken as they come
@@ -108,6 +118,8 @@ private:
     std::u16string asciiText;
     bool asciiTransparent = false;  // without state, and bytes of 7-bit ASCII stand for themselves
     bool midCharacter = false;      // the converter holds part of what it has read
+    detail::DirectForm directForm{};
+    const detail::ByteTable* byteTable = nullptr;
 };
 
 }  // namespace Orvandeil::FileIO

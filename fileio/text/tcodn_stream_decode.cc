@@ -1,9 +1,13 @@
 #include "fileio/constants.h"
-#include "fileio/host/text.h"
+#include "fileio/streams/file_stream.h"
 #include "fileio/text/conversion_size_error.h"
+#include "fileio/text/direct_transcoding.h"
+#include "fileio/text/input_string_stream.h"
 #include "fileio/text/tcodn_stream.h"
+#include "fileio/text/units_ahead.h"
 
 #include <algorithm>
+#include <typeinfo>
 #include <utility>
 
 #include <unicode/utf16.h>
@@ -30,14 +34,8 @@ constexpr unsigned long largestRead = 2147483647;
 constexpr std::size_t largestConversion = 0x3FFFFFFD;
 
 #ifdef FILEIO_FAST_PATHS
-// Widens the leading ASCII bytes and returns their number.
-std::size_t widenAscii(const char* bytes, std::size_t count, char16_t* out) {
-    std::size_t i = 0;
-    for (; i < count && static_cast<unsigned char>(bytes[i]) < 0x80; ++i) {
-        out[i] = static_cast<unsigned char>(bytes[i]);
-    }
-    return i;
-}
+// What the converter gets of a text that needs it only here and there.
+constexpr std::size_t smallestConversion = 128;
 #endif
 
 // Whether the converter keeps bytes or units back for its next call.
@@ -69,7 +67,11 @@ void dropHeldUnit(UConverter* converter) {
 }  // namespace
 
 unsigned long TcodnStream::asciiCheck(const char* bytes, unsigned long count) {
-    for (unsigned long i = 0; i < count; ++i) {
+    unsigned long i = 0;
+#ifdef FILEIO_FAST_PATHS
+    i = detail::asciiWithoutNul(bytes, count);
+#endif
+    for (; i < count; ++i) {
         const auto byte = static_cast<unsigned char>(bytes[i]);
         // A NUL that ends a read is let through on purpose.
         if (byte < 0x80 && (byte != 0 || i + 1 == count)) continue;
@@ -79,19 +81,30 @@ unsigned long TcodnStream::asciiCheck(const char* bytes, unsigned long count) {
     return 0;
 }
 
+// A long text passes through little memory where neither the converter's state nor who reads can
+// tell the difference. Detection can: it is told where in the read the text ceases to be ASCII.
+bool TcodnStream::readsInPieces() const {
+#ifdef FILEIO_FAST_PATHS
+    const std::type_info& type = typeid(*this);
+    return directForm != detail::DirectForm::None && !asciiSoFar &&
+           (type == typeid(fileStream) || type == typeid(inputStringStream));
+#else
+    return false;
+#endif
+}
+
 // One read to the layers above; memory grows with what is really there.
 TcodnStream::Undecoded TcodnStream::readUndecoded(unsigned long wanted) {
-    wanted = std::min(wanted, largestRead);
+    wanted = std::min(wanted, readsInPieces() ? constants::decodePieceBytes : largestRead);
     unsigned long piece = 0;
     unsigned long got = 0;
     std::size_t total = 0;
     do {
         piece = std::min(wanted - total, constants::transferPieceBytes);
-        readBytes.resize(total + piece);
+        if (readBytes.size() < total + piece) readBytes.resize(total + piece);
         got = GetNElements(piece, readBytes.data() + total, 1);
         total += got;
     } while (got == piece && total < wanted);
-    readBytes.resize(total);
     return {readBytes.data(), total, total, total == 0, false};
 }
 
@@ -100,8 +113,12 @@ unsigned long TcodnStream::GetNCodePoints(char16_t* out, unsigned long n,
     std::size_t unused = 0;
     std::size_t& consumed = bytesConsumed ? *bytesConsumed : unused;
     consumed = 0;
-    Undecoded bytes;
+#ifdef FILEIO_FAST_PATHS
+    unsigned long produced = detail::UnitsAhead(*this).takeUnits(out, n, consumed);
+#else
     unsigned long produced = 0;
+#endif
+    Undecoded bytes;
     while (produced < n && !bytes.exhausted) {
         if (bytes.count == 0) {
             // Never more bytes than units are wanted: one-byte encodings read nothing too far.
@@ -123,17 +140,27 @@ unsigned long TcodnStream::decode(Undecoded& bytes, char16_t* out, unsigned long
     return std::exchange(bytes.count, 0);
 }
 
+#ifdef FILEIO_FAST_PATHS
+unsigned long TcodnStream::convertDirectly(Undecoded& bytes, char16_t* out, unsigned long room) {
+    if (midCharacter) return 0;
+    const detail::Progress progress =
+        detail::decodeDirectly(directForm, tableOfConverter(), bytes.next, bytes.count, out, room);
+    bytes.drop(progress.taken);
+    return progress.made;
+}
+#endif
+
 unsigned long TcodnStream::convert(Undecoded& bytes, char16_t* out, unsigned long room,
                                    UConverter* from) {
+    std::size_t mostBytes = constants::converterPieceBytes;
 #ifdef FILEIO_FAST_PATHS
-    if (asciiTransparent && !midCharacter) {
-        const std::size_t ascii = widenAscii(bytes.next, std::min(bytes.count, room), out);
-        bytes.drop(ascii);
-        if (ascii != 0) return ascii;
+    if (directForm != detail::DirectForm::None) {
+        if (const unsigned long units = convertDirectly(bytes, out, room)) return units;
+        mostBytes = std::min(mostBytes, smallestConversion);
     }
 #endif
     const char* source = bytes.next;
-    const char* const sourceEnd = source + std::min(bytes.count, constants::converterPieceBytes);
+    const char* const sourceEnd = source + std::min(bytes.count, mostBytes);
     char16_t* target = out;
     const char16_t* const targetEnd = out + std::min(room, constants::converterPieceBytes);
     UErrorCode status = U_ZERO_ERROR;
@@ -209,32 +236,6 @@ unsigned long TcodnStream::GetNCodePoints(std::u16string& text, unsigned long n,
     text.resize(total);
     if (bytesConsumed) *bytesConsumed = consumed;
     return total;
-}
-
-unsigned long TcodnStream::GetString(OutputBuffer& buffer, long width, bool noLimit) {
-    long count = 0;
-    while (noLimit || count < width) {
-        char16_t unit;
-        std::size_t bytes = 0;
-        if (GetNCodePoints(&unit, 1, &bytes) == 0) break;
-        if (!qzu_isbreakablespace(unit)) {
-            std::size_t room = 1;
-            *static_cast<char16_t*>(buffer.Allocate(room)) = unit;
-            ++count;
-        } else if (count != 0) {
-            Rewind(bytes);
-            break;
-        }
-    }
-    return static_cast<unsigned long>(count);
-}
-
-void TcodnStream::SkipWhiteSpace() {
-    std::size_t bytes = 0;
-    do {
-        if (GetNCodePoints(oneChar, 1, &bytes) == 0) return;
-    } while (qzu_isbreakablespace(oneChar.front()));
-    Rewind(bytes);
 }
 
 }  // namespace Orvandeil::FileIO

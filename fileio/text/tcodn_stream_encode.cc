@@ -1,5 +1,6 @@
 #include "fileio/constants.h"
 #include "fileio/host/text.h"
+#include "fileio/text/direct_transcoding.h"
 #include "fileio/text/tcodn_stream.h"
 
 #include <algorithm>
@@ -10,10 +11,36 @@ namespace {
 // Units given to one converter call.
 constexpr std::size_t sliceUnits = constants::converterPieceBytes / sizeof(char16_t);
 
+#ifdef FILEIO_FAST_PATHS
+// Units encoded at once without the converter, and given to it where that is not possible.
+constexpr std::size_t directUnits = constants::transferPieceBytes / 64;
+constexpr std::size_t smallestConversion = 64;
+#endif
+
 // Room beyond one byte a unit: more than any single character with its escape sequences takes.
 constexpr std::size_t spareBytes = 32;
 
 }  // namespace
+
+#ifdef FILEIO_FAST_PATHS
+// Moves `text` and the bytes `used` of writeBytes behind what needs no converter.
+void TcodnStream::encodeDirectly(const char16_t*& text, const char16_t* textEnd,
+                                 std::size_t& used) {
+    UErrorCode status = U_ZERO_ERROR;
+    if (ucnv_fromUCountPending(converter, &status) != 0) return;
+    detail::Progress progress{};
+    std::size_t units = 0;
+    do {
+        units = std::min(static_cast<std::size_t>(textEnd - text), directUnits);
+        const std::size_t room = detail::roomToEncode(units);
+        if (writeBytes.size() - used < room) writeBytes.resize(used + room);
+        progress = detail::encodeDirectly(directForm, tableOfConverter(), text, units,
+                                          writeBytes.data() + used);
+        text += progress.taken;
+        used += progress.made;
+    } while (progress.taken == units && text != textEnd);
+}
+#endif
 
 // Most text takes a byte or little more a unit; what does not fit goes on in a larger block.
 // Returns the bytes put into writeBytes.
@@ -21,7 +48,15 @@ unsigned long TcodnStream::encode(const char16_t* text, unsigned long n, UErrorC
     const char16_t* const textEnd = text + n;
     std::size_t used = 0;
     do {
-        const std::size_t units = std::min(static_cast<std::size_t>(textEnd - text), sliceUnits);
+        std::size_t slice = sliceUnits;
+#ifdef FILEIO_FAST_PATHS
+        if (directForm != detail::DirectForm::None && status != U_BUFFER_OVERFLOW_ERROR) {
+            encodeDirectly(text, textEnd, used);
+            if (text == textEnd) return used;
+            slice = std::min(slice, smallestConversion);
+        }
+#endif
+        const std::size_t units = std::min(static_cast<std::size_t>(textEnd - text), slice);
         const std::size_t room = units + spareBytes;
         if (writeBytes.size() - used < room) writeBytes.resize(used + room);
         char* target = writeBytes.data() + used;
