@@ -62,6 +62,7 @@ long fileStream::takeOfLine(long limit, OutputBuffer& out, int& result) {
     if (limit > 0) room = std::min(room, static_cast<std::size_t>(limit));
     if (room == 0 || !detail::isAsciiTransparent(form)) return 0;
     const std::string_view bytes = ahead.bytes();
+    if (bytes.empty()) return 0;
     const char* const end = bytes.data() + bytes.size();
     auto* const units = static_cast<char16_t*>(out.Allocate(room));
     const std::size_t body = lengthOfBody(bytes);
