@@ -38,7 +38,7 @@ template <class To, class From>
 void checkRun(vxClassID to, vxClassID from, const std::vector<From>& elements) {
     using namespace Orvandeil::FileIO;
     std::vector<char> source(1 + elements.size() * sizeof(From));
-    std::memcpy(source.data() + 1, elements.data(), source.size() - 1);
+    if (!elements.empty()) std::memcpy(source.data() + 1, elements.data(), source.size() - 1);
     std::vector<char> target(2 + elements.size() * sizeof(To), 'x');
     const std::string pair = "class " + std::to_string(from) + " to " + std::to_string(to);
     const void* end =

@@ -29,8 +29,8 @@ std::string describe(const PrecisionString& p) {
     return text;
 }
 
-// The text that says in full what a precision holds.
-std::string spelt(const PrecisionString& p) {
+// The text that says what a precision holds, in full unless it has to be the short form.
+std::string spelt(const PrecisionString& p, bool isShort) {
     static const std::string names[] = {"",       "logical", "char",   "int8",     "int16",
                                         "int32",  "int64",   "uint8",  "uint16",   "uint32",
                                         "uint64", "single",  "double", "noconvert"};
@@ -40,6 +40,7 @@ std::string spelt(const PrecisionString& p) {
         source = (source[0] == 'u' ? "ubit" : "bit") + std::to_string(p.bitCount);
         if (p.convertedSize != 0) source += "in" + std::to_string(p.convertedSize);
     }
+    if (isShort) return '*' + source;
     return std::to_string(p.repeatCount) + '*' + source + "=>" + name(p.outputType);
 }
 
@@ -62,8 +63,9 @@ void precision(Bytes& input) {
     if (!parsed.valid || (target != text.npos && text.find('=', target + 2) != text.npos)) return;
     PrecisionString again;
     again.machineFormat = format;
-    again = spelt(parsed).c_str();
-    requireEqual(describe(again), describe(parsed), text + " again as " + spelt(parsed));
+    const std::string full = spelt(parsed, text[0] == '*');
+    again = full.c_str();
+    requireEqual(describe(again), describe(parsed), text + " again as " + full);
 }
 
 void permission(Bytes& input) {

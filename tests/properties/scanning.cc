@@ -61,10 +61,10 @@ struct Field {
 
 Field anyField(Bytes& input) {
     static const char* const formats[][2] = {
-        {"%d", "%ld"},       {"%ld", "%ld"}, {"%hd", "%ld"},   {"%x", "%lx"},
-        {"%lx", "0x%lX"},    {"%o", "0%lo"}, {"%i", "%ld"},    {"%li", "0x%lx"},
-        {"%u", "%lu"},       {"%lu", "%lu"}, {"%f", "%.3f"},   {"%g", "%.15g"},
-        {"%hf", "%.2e"},     {"%s", "w%ld"}, {" %c", "c%.0s"}, {" %[a-f]", "fade"},
+        {"%d", "%ld"},       {"%ld", "%ld"}, {"%hd", "%ld"}, {"%x", "%lx"},
+        {"%lx", "0x%lX"},    {"%o", "0%lo"}, {"%i", "%ld"},  {"%li", "0x%lx"},
+        {"%u", "%lu"},       {"%lu", "%lu"}, {"%f", "%.3f"}, {"%g", "%.15g"},
+        {"%hf", "%.2e"},     {"%s", "w%ld"}, {" %c", "c"},   {" %[a-f]", "fade"},
         {" %3[^0-9]", "-+x"}};
     const auto& format = input.of(formats);
     const bool isReal = format[0][1] == 'f' || format[0][1] == 'g' || format[0][2] == 'f';
