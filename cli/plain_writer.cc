@@ -10,6 +10,8 @@
 #include <string>
 #include <string_view>
 
+#include <unicode/utf16.h>
+
 namespace cli {
 
 namespace embedded = Orvandeil::FileIO::embedded;
@@ -57,11 +59,19 @@ void printNumbers(std::span<const T> elements, std::size_t rows, Report& report)
     block.flush();
 }
 
+// In slices, which end behind no first half of a pair.
 void printText(std::u16string_view text, Report& report) {
+    constexpr std::size_t sliceUnits = 1 << 16;
+    while (text.size() > sliceUnits) {
+        const std::size_t units = sliceUnits - (U16_IS_LEAD(text[sliceUnits - 1]) ? 1 : 0);
+        report.print(vxTextToNarrow(text.data(), units));
+        text.remove_prefix(units);
+    }
     report.print(vxTextToNarrow(text.data(), text.size()) + '\n');
 }
 
 void printChars(std::span<const char16_t> units, std::size_t rows, Report& report) {
+    if (rows == 1) return printText({units.data(), units.size()}, report);
     for (std::size_t row = 0; row < rows; ++row) {
         std::u16string line;
         for (std::size_t i = row; i < units.size(); i += rows)

@@ -39,7 +39,7 @@ inline constexpr std::size_t firstOutputBlockBytes = 1024;
 inline constexpr std::size_t numberScratchBytes = 512;
 inline constexpr std::size_t formatPieceBytes = 65536;
 inline constexpr std::size_t paddingBlockUnits = 256;
-inline constexpr std::size_t reservedChunkBytes = 65536;
+inline constexpr std::size_t reservedChunkBytes = 1048576;
 inline constexpr std::size_t elementBlockBytes = 4032;
 inline constexpr std::size_t elementSlice = 256;
 #endif

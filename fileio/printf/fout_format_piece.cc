@@ -2,6 +2,7 @@
 
 #include "fileio/constants.h"
 #include "fileio/errors/code_list.h"
+#include "fileio/printf/long_precision.h"
 #include "fileio/printf/number_text.h"
 #include "fileio/printf/printf_argument_source.h"
 #include "fileio/text/ascii_output.h"
@@ -127,6 +128,13 @@ int foutFormatPiece::printValue(TcodnStream* out, T value) const {
     int result = 0;
     if (printDirectly(out, value, result)) return result;
 #endif
+    if constexpr (std::is_floating_point_v<T>) {
+        if (isLongPrecision(*out, value)) {
+            return detail::printLongPrecision(*out, *variants[variant],
+                                              static_cast<int>(width.getEffective()),
+                                              static_cast<int>(precision.getEffective()), value);
+        }
+    }
     const char* const text = variants[variant]->c_str();
     const bool passPrecision = precision.isFromArgument() && !precision.isNegative();
     const int precisionPassed = static_cast<int>(precision.getEffective());
@@ -137,6 +145,17 @@ int foutFormatPiece::printValue(TcodnStream* out, T value) const {
     const int widthPassed = static_cast<int>(width.getEffective());
     return passPrecision ? out->printf(text, widthPassed, precisionPassed, value)
                          : out->printf(text, widthPassed, value);
+}
+
+// What no int can pass is refused by printf, and a stream that the library does not know sees one
+// print for a number.
+bool foutFormatPiece::isLongPrecision(const TcodnStream& out, double value) const {
+    constexpr long largest = std::numeric_limits<int>::max();
+    const long digits = hasPrecision() ? precision.getEffective() : 0;
+    const bool mayBeRefused = (digits == largest && (variants[variant]->back() | 0x20) == 'g') ||
+                              width.getEffective() >= largest;
+    return digits >= detail::longPrecision && !mayBeRefused && std::isfinite(value) &&
+           detail::isKnownStream(out);
 }
 
 #ifdef FILEIO_FAST_PATHS

@@ -108,6 +108,7 @@ private:
     void useVariant(Variant wanted, std::string (*build)(const std::string&));
     template <class T>
     int printValue(TcodnStream* out, T value) const;
+    bool isLongPrecision(const TcodnStream& out, double value) const;
     // What printValue does, without the C library. False when it cannot, and nothing is done.
     template <class T>
     bool printDirectly(TcodnStream* out, T value, int& result) const;

@@ -12,7 +12,7 @@ namespace {
 
 template <class... Arguments>
 std::string formatted(const std::string& format, Arguments... arguments) {
-    std::array<char, 1024> text{};
+    std::array<char, 2048> text{};
     std::snprintf(text.data(), text.size(), format.c_str(), arguments...);
     return text.data();
 }
@@ -71,6 +71,24 @@ TEST(PrintfOracle, BitPatternsOfEveryFlag) {
     for (const auto& row : rows) {
         EXPECT_EQ(fileio_tests::print(row.format, makeScalar(row.value)).text, row.text)
             << "row of line " << row.line;
+    }
+}
+
+TEST(PrintfOracle, PrecisionsBeyondTheDigitsOfADouble) {
+    for (unsigned set = 0; set < 32; ++set) {
+        std::string flags = "%";
+        for (unsigned i = 0; i < 5; ++i) {
+            if (set >> i & 1) flags += "-+ #0"[i];
+        }
+        for (const std::string field : {".1150", "1300.1101"}) {
+            for (const char conversion : {'e', 'E', 'f', 'g', 'G'}) {
+                for (const double value : {0.0, -0.1, 1e300, 5e-324, -2.5e17}) {
+                    const std::string format = flags + field + conversion;
+                    EXPECT_EQ(fileio_tests::print(format, makeScalar(value)).text,
+                              formatted(format, value));
+                }
+            }
+        }
     }
 }
 
