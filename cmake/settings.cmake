@@ -22,6 +22,9 @@ if(FILEIO_SANITIZE)
   target_compile_options(fileio_settings INTERFACE
       -fsanitize=address,undefined -fno-sanitize-recover=all -fno-omit-frame-pointer)
   target_link_options(fileio_settings INTERFACE -fsanitize=address,undefined)
+elseif(FILEIO_COVERAGE)
+  target_compile_options(fileio_settings INTERFACE --coverage -fprofile-update=atomic)
+  target_link_options(fileio_settings INTERFACE --coverage)
 else()
   # Stack and buffers are checked, and symbols bound once and then write-protected.
   target_compile_options(fileio_settings INTERFACE -fstack-protector-strong
