@@ -57,7 +57,7 @@ bool AsciiOutput::suits(TcodnStream& out) {
 AsciiOutput::AsciiOutput(TcodnStream& out)
     : string(exactly<outputStringStream>(out)),
       file(string != nullptr ? nullptr : exactly<fileStream>(out)),
-      unitBytes(string != nullptr && out.utf16 ? sizeof(char16_t) : 1) {}
+      unitBytes(string != nullptr && out.writesUnits() ? sizeof(char16_t) : 1) {}
 
 bool AsciiOutput::keepsAscii() const {
     return string != nullptr || file->asciiTransparent;

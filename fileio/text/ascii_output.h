@@ -20,6 +20,7 @@ public:
     // string stream.
     static bool suits(TcodnStream& out);
 
+    // Decides the encoding of a string stream, too: nothing may have been written so far.
     explicit AsciiOutput(TcodnStream& out);
 
     // Whether text is encoded as its ASCII bytes; what print() writes always is.
