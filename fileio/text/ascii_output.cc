@@ -44,11 +44,17 @@ void widenAscii(const char* text, std::size_t count, char* out) {
     }
 }
 
+// Half a pair that waits in the converter goes out before anything else.
+bool holdsUnits(const UConverter* converter) {
+    UErrorCode ignored = U_ZERO_ERROR;
+    return ucnv_fromUCountPending(converter, &ignored) != 0;
+}
+
 }  // namespace
 
 bool AsciiOutput::suits(TcodnStream& out) {
     if (exactly<outputStringStream>(out) != nullptr) {
-        return out.writesUnits() || out.asciiTransparent;
+        return out.writesUnits() || (out.asciiTransparent && !holdsUnits(out.converter));
     }
     const fileStream* const file = exactly<fileStream>(out);
     return file != nullptr && isBlockBuffered(file->file);
