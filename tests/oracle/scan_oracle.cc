@@ -6,6 +6,7 @@
 #include <cmath>
 #include <cstdlib>
 #include <cstring>
+#include <vector>
 
 namespace oracle {
 namespace {
@@ -180,43 +181,13 @@ long Fields::width() {
 }
 
 std::string Fields::text(std::size_t tokens) {
-    static const std::string special[] = {"-0",
-                                          "0x",
-                                          "-0x",
-                                          "0X1",
-                                          "inf",
-                                          "-nan",
-                                          "in",
-                                          "na",
-                                          "INF",
-                                          "NaN",
-                                          "1e+",
-                                          "1e5",
-                                          "1.",
-                                          ".5",
-                                          "0b1",
-                                          "-.",
-                                          "e-",
-                                          " -",
-                                          "0x.",
-                                          "+0",
-                                          "e+9",
-                                          "0x1e",
-                                          "1e999",
-                                          "e-999",
-                                          "infinity",
-                                          "9223372036854775807",
-                                          "9223372036854775808",
-                                          "-9223372036854775808",
-                                          "-9223372036854775809",
-                                          "18446744073709551615",
-                                          "18446744073709551616",
-                                          "-18446744073709551615",
-                                          "-18446744073709551616",
-                                          "0x7fffffffffffffff",
-                                          "0x8000000000000000",
-                                          "0777777777777777777777",
-                                          "01777777777777777777777"};
+    static const std::vector<std::string> special = properties::split(
+        "-0|0x|-0x|0X1|inf|-nan|in|na|INF|NaN|1e+|1e5|1.|.5|0b1|-.|e-| -|0x.|+0|e+9|0x1e|"
+        "1e999|e-999|infinity|9223372036854775807|9223372036854775808|"
+        "-9223372036854775808|-9223372036854775809|18446744073709551615|"
+        "18446744073709551616|-18446744073709551615|-18446744073709551616|"
+        "0x7fffffffffffffff|0x8000000000000000|0777777777777777777777|"
+        "01777777777777777777777");
     std::string result;
     for (std::size_t i = 0; i < tokens; ++i) {
         const std::size_t kind = input.below(12), number = input.below(64);

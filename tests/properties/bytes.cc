@@ -4,6 +4,7 @@
 #include <cmath>
 #include <cstdio>
 #include <limits>
+#include <sstream>
 
 namespace properties {
 namespace {
@@ -20,6 +21,14 @@ std::string printable(std::string_view text) {
 }
 
 }  // namespace
+
+std::vector<std::string> split(const std::string& text, char separator) {
+    std::istringstream in(text);
+    std::vector<std::string> parts;
+    for (std::string part; std::getline(in, part, separator);)
+        parts.push_back(part);
+    return parts;
+}
 
 void requireEqual(const std::string& found, const std::string& wanted, const std::string& where) {
     if (found == wanted) return;

@@ -6,6 +6,7 @@
 #include <stdexcept>
 #include <string>
 #include <string_view>
+#include <vector>
 
 // What properties are checked with: bytes turned into choices, and a way to say what does not hold.
 namespace properties {
@@ -18,13 +19,16 @@ public:
 // Throws Broken, which tells both texts and where they come from.
 void requireEqual(const std::string& found, const std::string& wanted, const std::string& where);
 
+// The parts of a text between separators.
+std::vector<std::string> split(const std::string& text, char separator = '|');
+
 // UTF-16 as the bytes that hold it.
 inline std::string bytesOf(std::u16string_view text) {
     return {reinterpret_cast<const char*>(text.data()), 2 * text.size()};
 }
 
-// Any bytes, which the caller keeps, turned into choices one after another. Used up, they give zeros. They also digest what
-// was seen of the tested, so that two builds can be compared.
+// Any bytes, which the caller keeps, turned into choices one after another. Used up, they give
+// zeros. They also digest what was seen of the tested, so that two builds can be compared.
 class Bytes {
 public:
     explicit Bytes(std::string_view input) : rest(input) {}

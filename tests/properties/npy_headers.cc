@@ -32,31 +32,11 @@ std::string readFile(const std::string& content) {
 // A header is refused as such, or says the same when it is written again. A file is read or
 // refused, whatever its header promises, and its data are those behind the header.
 void npyHeaders(Bytes& input) {
-    static const std::string parts[] = {"{",
-                                        "}",
-                                        "'descr'",
-                                        ": ",
-                                        "'<f8'",
-                                        "'fortran_order'",
-                                        "True",
-                                        "False",
-                                        "'shape'",
-                                        "(",
-                                        ")",
-                                        ",",
-                                        "2",
-                                        "3,",
-                                        "0",
-                                        "'|b1'",
-                                        "'>i2'",
-                                        "'c16'",
-                                        "{'descr': '<u2', ",
-                                        "'shape': (1, 2), ",
-                                        "'fortran_order': False, ",
-                                        "18446744073709551615",
-                                        "[",
-                                        "L",
-                                        "4294967296, "};
+    static const std::vector<std::string> parts = split(
+        "{~}~'descr'~: ~'<f8'~'fortran_order'~True~False~'shape'~(~)~,~2~3,~0~'|b1'~'>i2'~"
+        "'c16'~{'descr': '<u2', ~'shape': (1, 2), ~'fortran_order': False, ~"
+        "18446744073709551615~[~L~4294967296, ",
+        '~');
     const std::string text = input.text(parts, 30);
     NpyHeader header;
     std::string raised = fileio_tests::raisedBy([&] { header = parseNpyHeader(text, "file"); });

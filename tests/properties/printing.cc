@@ -1,6 +1,7 @@
 #include "tests/support/printing.h"
 
 #include "embedded/services/element_types.h"
+#include "embedded/services/memory.h"
 #include "fileio/host/memory.h"
 #include "fileio/printf/printf_controller.h"
 #include "fileio/text/output_string_stream.h"
@@ -9,9 +10,11 @@
 #include "tests/support/test_files.h"
 
 #include <cctype>
+#include <cerrno>
 #include <cmath>
 #include <cstdio>
 #include <cstring>
+#include <optional>
 #include <type_traits>
 
 // The C library's printf is the referee for whatever a number looks like. A stream of a class that
@@ -115,20 +118,40 @@ void againstC(Bytes& input) {
     input.observe(text);
 }
 
+// What shows of a call but its text.
 std::string print(TcodnStream& out, const std::u16string& format, Arguments arguments) {
-    printfController controller(format, &out, arguments.data(), static_cast<int>(arguments.size()));
-    bool complete = false;
-    const std::string raised = fileio_tests::raisedBy([&] { complete = controller.doPrintf(); });
-    return " complete " + std::to_string(complete) + " code " +
-           std::to_string(controller.getErrorCode()) + " error " +
-           std::to_string(out.getErrorCode()) + ' ' + raised;
+    std::string seen;
+    const std::string early = fileio_tests::raisedBy([&] {
+        printfController controller(format, &out, arguments.data(),
+                                    static_cast<int>(arguments.size()));
+        bool complete = false;
+        const std::string raised =
+            fileio_tests::raisedBy([&] { complete = controller.doPrintf(); });
+        const foutFormatPiece* const piece = controller.getCurrentPiece();
+        seen = " complete " + std::to_string(complete) + " code " +
+               std::to_string(controller.getErrorCode()) + ' ' + raised + " at " +
+               std::to_string(piece == nullptr ? 0 : piece->getFormatPosition());
+    });
+    return early + seen + " error " + std::to_string(out.getErrorCode());
 }
+
+// From a given call on (0 is never), an allocation fails once, or all writes do.
+struct Failures {
+    std::size_t allocation = 0;
+    int write = 0, error = 0;
+    std::size_t bufferSize = 64;
+};
 
 template <class Stream>
 std::string printToString(const std::string& encoding, const std::u16string& format,
-                          const Arguments& arguments) {
+                          const Arguments& arguments, const Failures& failures = {}) {
     Stream out(encoding);
-    const std::string end = print(out, format, arguments);
+    std::string end;
+    {
+        std::optional<FailingAllocation> failing;
+        if (failures.allocation != 0) failing.emplace(failures.allocation);
+        end = print(out, format, arguments) + (failing && failing->happened() ? " failed" : "");
+    }
     long bytes = 0;
     out.getPosition(bytes);
     void* const block = out.transferBuffer();
@@ -139,14 +162,15 @@ std::string printToString(const std::string& encoding, const std::u16string& for
 
 template <class Stream>
 std::string printToFile(const std::string& encoding, const std::u16string& format,
-                        const Arguments& arguments) {
-    support::FaultyFile memory;
-    std::FILE* const file = memory.open("w", 64);
+                        const Arguments& arguments, const Failures& failures = {}) {
+    support::FaultyFile memory{
+        .bytes = "", .failingWrite = failures.write, .error = failures.error};
+    std::FILE* const file = memory.open("w", failures.bufferSize);
     FilePermission permission("w", false);
     std::string end;
     {
         Stream out(file, encoding, permission, u"");
-        end = print(out, format, arguments);
+        end = print(out, format, arguments) + " wrote " + std::to_string(out.getBytesWritten());
     }
     std::fclose(file);
     return memory.bytes + end;
@@ -183,23 +207,42 @@ bool hasLongNumber(const std::string& format) {
     return false;
 }
 
+ArrayPtr tiled(ArrayPtr array, std::size_t times) {
+    const vxClassID classID = vxArrayClassID(array.get());
+    const std::size_t count = elementCount(*array), bytes = count * elementBytes(classID);
+    if (bytes == 0) return array;
+    ArrayPtr result = makeNumeric(classID, {1, count * times});
+    for (std::size_t i = 0; i < times; ++i)
+        std::memcpy(static_cast<char*>(realData(*result)) + i * bytes, realData(*array), bytes);
+    return result;
+}
+
+// More of the same, with memory or a disk that comes to its end.
+void withFailures(Bytes& input, const std::string& text, const std::string& encoding,
+                  std::vector<ArrayPtr>& owned) {
+    static const std::size_t bufferSizes[] = {4096, 4100, 8192};
+    const std::size_t times = 1 + input.below(30);
+    Arguments arguments;
+    for (ArrayPtr& argument : owned)
+        arguments.push_back((argument = tiled(std::move(argument), times)).get());
+    Failures failures = {.allocation = input.below(60), .bufferSize = input.of(bufferSizes)};
+    const std::u16string format =
+        fileio_tests::toUtf16(text + std::string(input.below(4) == 0 ? input.below(400) : 0, '*'));
+    requireEqual(printToString<outputStringStream>(encoding, format, arguments, failures),
+                 printToString<UnknownStringStream>(encoding, format, arguments, failures),
+                 text + " with failing memory");
+    // Padding of text is written in blocks, of which a failing file counts all or nothing.
+    if (text.find_first_of("sc") == text.npos) failures.write = static_cast<int>(input.below(6));
+    failures.error = failures.write % 2 == 0 ? ENOSPC : 0;
+    requireEqual(printToFile<fileStream>(encoding, format, arguments, failures),
+                 printToFile<UnknownFileStream>(encoding, format, arguments, failures),
+                 text + " to a full disk");
+}
+
 void againstUnknownStreams(Bytes& input) {
-    static const std::string parts[] = {"%d",   "%f",
-                                        "%g",   "%s",
-                                        "%c",   "%5.3e",
-                                        "%x",   "%bx",
-                                        "%to",  "%-",
-                                        "%0",   "%+",
-                                        "%.",   "%*d",
-                                        "%.*f", "%1$d",
-                                        "%2$s", "*1$",
-                                        "%ld",  "%%",
-                                        "%",    ", ",
-                                        "\n",   "é",
-                                        "€",    "\xF0\x9F\x98\x80",
-                                        "$",    "%-8.3f",
-                                        "%12d", "%i",
-                                        "%u"};
+    static const std::vector<std::string> parts = split(
+        "%d|%f|%g|%s|%c|%5.3e|%x|%bx|%to|%-|%0|%+|%.|%*d|%.*f|%1$d|%2$s|*1$|%ld|%%|%|, |\n|é|€|"
+        "\xF0\x9F\x98\x80|$|%-8.3f|%12d|%i|%u");
     static const char* const encodings[] = {"",       "",          "UTF-8", "ISO-8859-1",
                                             "UTF-16", "Shift_JIS", "UTF-7", "UTF-32BE"};
     const std::string text = input.text(parts, 20), encoding = input.of(encodings);
@@ -213,9 +256,11 @@ void againstUnknownStreams(Bytes& input) {
     const std::string seen = printToString<outputStringStream>(encoding, format, arguments);
     requireEqual(seen, printToString<UnknownStringStream>(encoding, format, arguments), text);
     input.observe(seen);
-    if (encoding.empty()) return;
-    requireEqual(printToFile<fileStream>(encoding, format, arguments),
-                 printToFile<UnknownFileStream>(encoding, format, arguments), text + " to a file");
+    if (!encoding.empty())
+        requireEqual(printToFile<fileStream>(encoding, format, arguments),
+                     printToFile<UnknownFileStream>(encoding, format, arguments),
+                     text + " to a file");
+    if (!input.empty()) withFailures(input, text, encoding, owned);
 }
 
 }  // namespace

@@ -89,11 +89,9 @@ void scanning(Bytes& input) {
                                           "%i", "%5",   "%*",  "%ld", "%hu",    "%lx", "%o", "%%",
                                           "%",  "%[a-", "]",   "%2d", "%3s",    "%g",  "é",  "\n",
                                           "%u", "%*d",  "%he", "%2c", "%*[^\n]"};
-    static const std::string texts[] = {
-        "1",  "-2.5", " ",    ",",   "\n",    "0x1F", "abc",
-        "é",  "€",    "1e5",  "Inf", "nan",   "\t",   "12",
-        "%",  "\r\n", "\xFF", "07",  "65536", "+",    "\xF0\x9F\x98\x80",
-        "3;4"};
+    static const std::vector<std::string> texts = split(
+        "1|-2.5| |,|\n|0x1F|abc|é|€|1e5|Inf|nan|\t|12|%|\r\n|\xFF|07|65536|+|\xF0\x9F\x98\x80|"
+        "3;4");
     const std::string format = input.text(formats, 8), encoding = input.of(encodings);
     const long limit = input.below(3) == 0 ? static_cast<long>(input.below(9)) : -1;
     const std::size_t bufferSize = 1 + input.below(20);

@@ -90,12 +90,9 @@ bool dependsOnPieces(std::string_view encoding, bool isDecoding) {
 
 // Where a text is cut does not matter for what it decodes to.
 void decoding(Bytes& input) {
-    static const std::string parts[] = {"\xE3\x81",     "\xE3\x81\x82", "\xF0\x9F\x98\x80",
-                                        "\x1B$B",       "\x1B(B",       "\r\n",
-                                        "\xED\xA0\x80", "\xFE\xFF",     "\xFF\xFE",
-                                        "+AGE-",        "\x0E\x30\x0F", "~{0!~}",
-                                        "\x81",         "\xC0\x80",     "\xE9",
-                                        "\xD8\x3D"};
+    static const std::vector<std::string> parts = split(
+        "\xE3\x81|\xE3\x81\x82|\xF0\x9F\x98\x80|\x1B$B|\x1B(B|\r\n|\xED\xA0\x80|\xFE\xFF|"
+        "\xFF\xFE|+AGE-|\x0E\x30\x0F|~{0!~}|\x81|\xC0\x80|\xE9|\xD8\x3D");
     const char* const encoding = anyConverter(input);
     if (dependsOnPieces(encoding, true)) return;
     std::string bytes = input.text(parts, 30);

@@ -62,41 +62,10 @@ std::string shown(const vxArray* array) {
 
 // Any argument is a value or refused, and a value written out is the same value.
 void values(Bytes& input) {
-    static const std::string parts[] = {"[",
-                                        "]",
-                                        ";",
-                                        " ",
-                                        ",",
-                                        "1",
-                                        "-2.5",
-                                        "1e300",
-                                        "Inf",
-                                        "NaN",
-                                        "int8:",
-                                        "uint64:",
-                                        "single:",
-                                        "double:",
-                                        "char:",
-                                        "logical:",
-                                        "'",
-                                        "string:",
-                                        "complex:",
-                                        "i",
-                                        "+",
-                                        "1+2i",
-                                        "-i",
-                                        ".",
-                                        "e-9",
-                                        "@",
-                                        ".npy",
-                                        "int64:",
-                                        "18446744073709551615",
-                                        "<missing>",
-                                        "é",
-                                        "\xFF",
-                                        "0x",
-                                        "\xF0\x9F\x98\x80",
-                                        ":"};
+    static const std::vector<std::string> parts = split(
+        "[|]|;| |,|1|-2.5|1e300|Inf|NaN|int8:|uint64:|single:|double:|char:|logical:|'|string:|"
+        "complex:|i|+|1+2i|-i|.|e-9|@|.npy|int64:|18446744073709551615|<missing>|é|\xFF|0x|"
+        "\xF0\x9F\x98\x80|:");
     const std::string argument = input.text(parts, 14);
     ArrayPtr array;
     std::string refused;
