@@ -38,39 +38,6 @@ void check(const char* table, const PrecisionString& start) {
     EXPECT_TRUE(recorder.warnings().empty());
 }
 
-TEST(PrecisionString, ReadsForReading) {
-    check(
-        "*bool: 1>1|*logical: 1>1|*char: 2>2|*char*1: 2>2|*schar: 3>3|*signed char: 3>3|*int8: 3>3|"
-        "*integer*1: 3>3|*short: 4>4|*int16: 4>4|*integer*2: 4>4|*int: 5>5|*long: 5>5|*int32: 5>5|"
-        "*integer*4: 5>5|*integer*8: 6>6|*uchar: 7>7|*unsigned char: 7>7|*uint8: 7>7|*ushort: 8>8|"
-        "*unsigned short: 8>8|*uint16: 8>8|*uint: 9>9|*unsigned int: 9>9|*ulong: 9>9|*uint32: 9>9|"
-        "*unsigned long: 9>9|*float: 11>11|*single: 11>11|*float32: 11>11|*real*4: 11>11|"
-        "*double: 12>12|*float64: 12>12|*real*8: 12>12|int64: 6>12 s8 @5|uint64: 10>12 s8 @5|"
-        "uchar: 7>12|* \tint16: 4>4|40*uchar=>char: 7>2 x40|007* double=>single: 12>11 x7|"
-        "2147483647*int8: 3>12 x2147483647|int8=> char: 3>2|int16=>noconvert: 4>13|"
-        "uint8=>int64: 7>6 @5",
-        PrecisionString());
-    // A target that is none leaves the output type alone; a field has to have the width of a type.
-    check(
-        "uchar=>nonsense: 7>12|uchar=>: 7>12|uchar=>char : 7>12|uchar=>int8=>int16: 7>12|"
-        "uchar=>bit0: 7>12|uchar=>ubit8: 7>7|uchar=>bit16: 7>4|uchar=>ubit32: 7>9|"
-        "uchar=>bit64: 7>6 @5",
-        PrecisionString());
-}
-
-TEST(PrecisionString, RefusesForReading) {
-    std::istringstream refused(
-        "| uchar|uchar |Uchar|signed  char|char*2|int32*2|noconvert|*noconvert|"
-        "*|3*|**uchar|*3*uchar|3**uchar|3uchar|3 *uchar| 3*uchar|+3*uchar|-1*uchar|0*uchar|"
-        "2147483648*int8|99999999999999999999*int8|"
-        "int8 =>char|int8= >char|int8=|int8=char|*int8=>int|"
-        "uchar=>bit3|uchar=>bit40|uchar=>bit8in8|uchar=>bit16in16|"
-        "bit|bit 8|bit +8|bit-8|bit8 |bits8|bit18446744073709551617|"
-        "bit8in|bit8in 16|bit8in-16|bit8in16x|bit8 in16|int8in|bit1in18446744073709551617");
-    for (std::string text; std::getline(refused, text, '|');)
-        check((text + ": badprecision_vx").c_str(), PrecisionString());
-}
-
 TEST(PrecisionString, ReadsForWriting) {
     constexpr int single = 11;
     check(
@@ -79,19 +46,6 @@ TEST(PrecisionString, ReadsForWriting) {
         PrecisionString(single));
     // The class of the values has no type in files.
     check("uint8: 0>7|noconvert: badprecision_vx", PrecisionString(0));
-}
-
-TEST(PrecisionString, SizesElementsOfForeignFormats) {
-    PrecisionString precision;
-    precision.machineFormat = 1;  // big endian
-    check(
-        "int16: 4>12 s2 @1|int64: 6>12 s8 @6|integer*8: 6>12 s8 @1|uint8=>int64: 7>6 s1 @6|"
-        "int8=>noconvert: 3>13 s1 @1|ubit12: 8>12 b12 @1|bit33: 6>12 b33 @6|uint8=>uint32: 7>9 s1 "
-        "@1|"
-        "bit20in40: 6>12 b20 s40 @1|bit33in40: 6>12 b33 s40 @6",
-        precision);
-    precision.machineFormat = 6;  // with 64-bit longs
-    check("uint64: 10>12 s8 @6|bit64: 6>12 b64 @6", precision);
 }
 
 // Every field without a container (room -1) and in containers of every size. Plain fields spelled

@@ -34,46 +34,7 @@ std::string summary(const SizeAttribute& size) {
            errorOf(size);
 }
 
-std::string sizeOf(const std::vector<double>& values) {
-    return summary(SizeAttribute(makeDoubles(1, values.size(), values).get()));
-}
-
-TEST(SizeAttribute, ParsesNumbersAndPairs) {
-    EXPECT_EQ(sizeOf({2.9}), "2 1 ");
-    EXPECT_EQ(sizeOf({0}), "0 0 ");
-    EXPECT_EQ(sizeOf({0.5}), "0 1 ");
-    EXPECT_EQ(sizeOf({limit}), "281474976710655 1 ");
-    EXPECT_EQ(sizeOf({limit + 1}), "1 0 infinite ");
-    EXPECT_EQ(sizeOf({3, 4.9}), "3 4 matrix ");
-    EXPECT_EQ(sizeOf({3, inf}), "3 0 matrix infinite ");
-    EXPECT_EQ(sizeOf({0, inf}), "0 0 matrix ");
-    EXPECT_EQ(sizeOf({0.5, inf}), "0 0 matrix infinite ");
-    EXPECT_EQ(sizeOf({16777216, 16777215}), "16777216 16777215 matrix ");
-    for (const std::vector<double>& values : std::vector<std::vector<double>>{{-0.5},
-                                                                              {NAN},
-                                                                              {},
-                                                                              {16777216, 16777216},
-                                                                              {limit + 1, 0},
-                                                                              {0, NAN},
-                                                                              {NAN, 1},
-                                                                              {1, -0.1},
-                                                                              {1, 2, 3}})
-        EXPECT_EQ(sizeOf(values), "1 0 badsize_vx") << testing::PrintToString(values);
-}
-
-TEST(SizeAttribute, LooksAtTheTypeBeforeTheShape) {
-    const auto error = [](const ArrayPtr& array) { return errorOf(SizeAttribute(array.get())); };
-    EXPECT_EQ(error(embedded::makeChars(u"")), "sizeMustBeNumeric");
-    EXPECT_EQ(error(embedded::makeNumeric(vxLOGICAL_CLASS, {1, 1})), "sizeMustBeNumeric");
-    EXPECT_EQ(error(embedded::makeNumeric(vxDOUBLE_CLASS, {1, 1}, vxCOMPLEX)), "sizeMustBeNumeric");
-    EXPECT_EQ(error(embedded::makeString(u"7")), "sizeMustBeNumeric");
-    EXPECT_EQ(error(embedded::makeNumeric(vxDOUBLE_CLASS, {1, 1, 2})), "badsize_vx");
-    EXPECT_EQ(error(embedded::makeNumeric(vxINT8_CLASS, {2, 1})), "badsize_vx");
-    EXPECT_EQ(error(makeRow<std::int8_t>(vxINT8_CLASS, {-1})), "badsize_vx");
-    EXPECT_EQ(error(makeRow<std::uint64_t>(vxUINT64_CLASS, {7, 8})), "");
-}
-
-TEST(SizeAttribute, StartsAfreshEachTime) {
+TEST(NumericAttr, StartsAfreshEachTime) {
     SizeAttribute size;
     EXPECT_EQ(summary(size), "1 0 infinite ");
     size = embedded::makeChars(u"7").get();
@@ -83,6 +44,15 @@ TEST(SizeAttribute, StartsAfreshEachTime) {
     size = makeDoubles(1, 1, {NAN}).get();
     EXPECT_EQ(summary(size), "1 0 badsize_vx");
     EXPECT_EQ(errorOf(copy), "sizeMustBeNumeric");
+
+    size = embedded::makeNumeric(vxDOUBLE_CLASS, {1, 1, 2}).get();
+    EXPECT_EQ(errorOf(size), "badsize_vx");
+    SkipAttribute skip;
+    skip = makeDoubles(1, 1, {2.5}).get();
+    EXPECT_EQ(errorOf(skip), "badskip_vx");
+    skip = makeDoubles(1, 1, {3}).get();
+    EXPECT_EQ(errorOf(skip), "");
+    EXPECT_EQ(skip.skip, 3);
 
     int form = 9;
     EXPECT_EQ(size.ParseSize(makeDoubles(1, 2, {5, 6}).get(), &form), 0);
@@ -110,26 +80,6 @@ TEST(SizeAttribute, AdjustsToBytesInOneRow) {
     EXPECT_EQ(adjusted(13, 0, 5, false, 0), "0 5" + tooBig);
     EXPECT_EQ(adjusted(13, 3, 5, false, 0), "3 5" + tooBig);
     EXPECT_EQ(adjusted(13, 1ul << 32, 1ul << 31, false, 1), "1 9223372036854775808");
-}
-
-TEST(SkipAttribute, TakesTheFirstElement) {
-    SkipAttribute reused;
-    const auto skip = [&](const ArrayPtr& array) {
-        reused = array.get();
-        return std::to_string(reused.skip) + errorOf(reused);
-    };
-    const std::string bad = "badskip_vx";
-    EXPECT_EQ(skip(makeDoubles(2, 1, {2, 9})), "2");
-    EXPECT_EQ(skip(makeDoubles(1, 1, {3.5})), "3" + bad);
-    EXPECT_EQ(skip(makeRow<std::int8_t>(vxINT8_CLASS, {5})), "5");
-    EXPECT_EQ(skip(makeRow<std::uint64_t>(vxUINT64_CLASS, {LONG_MAX})), std::to_string(LONG_MAX));
-    EXPECT_EQ(skip(makeRow<std::uint64_t>(vxUINT64_CLASS, {1ul << 63})),
-              std::to_string(LONG_MAX) + bad);
-    EXPECT_EQ(skip(embedded::makeScalar(-1)), "-1" + bad);
-    EXPECT_EQ(skip(embedded::makeScalar(inf)), "1" + bad);
-    EXPECT_EQ(skip(makeDoubles(0, 0, {})), "0" + bad);
-    EXPECT_EQ(skip(embedded::makeChars(u"3")), "0" + bad);
-    EXPECT_EQ(skip(embedded::makeNumeric(vxLOGICAL_CLASS, {1, 1})), "0" + bad);
 }
 
 TEST(NumericAttr, ReadsWholeNumbersOf64Bits) {
