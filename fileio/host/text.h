@@ -11,6 +11,7 @@ struct vxConsoleSink;
 
 // Whether a line may break at this code unit: the blanks between words, line breaks included, but
 // no no-break blank. A byte is asked about sign-extended, so that 0x80 to 0xFF are never blanks.
+// The library may remember the answer for ASCII units: it must not change.
 FILEIO_API bool qzu_isbreakablespace(char16_t unit);
 
 // UTF-16 to the host's narrow encoding; what it cannot hold is substituted.
