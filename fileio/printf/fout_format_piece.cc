@@ -59,17 +59,14 @@ foutFormatPiece::foutFormatPiece(const foutFormatPieceInitBlock& init)
       precision(precisionValidator, init.precisionKind, init.precision),
       formatPosition(init.formatPosition),
       conversion(init.conversion),
-      subformat(init.subformat) {
-    if (conversion != NoConversion) {
-        variants[AsParsed] = std::make_unique<std::string>(init.printfFormat);
-    }
+      subformat(init.subformat),
+      parsedText(init.printfFormat) {
+    if (conversion != NoConversion) variants[AsParsed] = &parsedText;
 }
 
-foutFormatPiece::~foutFormatPiece() = default;
-
-const std::string& foutFormatPiece::getPrintfText() const {
-    static const std::string none;
-    return variants[AsParsed] ? *variants[AsParsed] : none;
+foutFormatPiece::~foutFormatPiece() {
+    for (int built = AsParsed + 1; built < variantCount; ++built)
+        delete variants[built];
 }
 
 unsigned long foutFormatPiece::getBufferSize() const {
@@ -89,8 +86,8 @@ void foutFormatPiece::chooseVariant() {
 
 // Builds the variant from the one in use, once, and switches to it.
 void foutFormatPiece::useVariant(Variant wanted, std::string (*build)(const std::string&)) {
-    if (!variants[wanted]) {
-        variants[wanted] = std::make_unique<std::string>(build(*variants[variant]));
+    if (variants[wanted] == nullptr) {
+        variants[wanted] = new std::string(build(*variants[variant]));
     }
     variant = wanted;
 }
@@ -167,17 +164,24 @@ bool foutFormatPiece::printDirectly(TcodnStream* out, T value, int& result) cons
     }
     const long field = width.getEffective();
     const long digits = hasPrecision() ? precision.getEffective() : 0;
-    if (std::max(field, digits) > detail::largestField || !detail::AsciiOutput::suits(*out)) {
-        return false;
-    }
+    auto* const console = detail::exactly<outputScreenStream>(*out);
+    const bool suits = console != nullptr || detail::AsciiOutput::suits(*out);
+    if (std::max(field, digits) > detail::largestField || !suits) return false;
     const bool inExponentForm = variant == Exponent || variant == ExponentNoPrecision;
     const char letter = inExponentForm ? 'e' : variants[AsParsed]->back();
     const detail::NumberForm form = detail::makeNumberForm(
         letter, flags, static_cast<int>(field), hasPrecision(), static_cast<int>(digits));
     if (!detail::isKnownForm(form) || !detail::writesAsPrintf()) return false;
-    char text[detail::largestNumberBytes];
-    const auto count = static_cast<std::size_t>(detail::writeNumber(text, form, value) - text);
-    result = detail::AsciiOutput(*out).write(text, count) == count ? static_cast<int>(count) : -1;
+    char text[detail::largestNumberBytes + 1];
+    char* const end = detail::writeNumber(text, form, value);
+    *end = '\0';
+    const auto count = static_cast<std::size_t>(end - text);
+    if (console != nullptr) {
+        result = console->putFormatted(text, count);
+    } else {
+        const std::size_t written = detail::AsciiOutput(*out).write(text, count);
+        result = written == count ? static_cast<int>(count) : -1;
+    }
     return true;
 }
 #endif

@@ -73,7 +73,7 @@ public:
     WidthPrecisionFieldType getPrecisionKind() const { return precision.getKind(); }
     int getPrecisionValue() const { return precision.getValue(); }
     // For the C library; empty for a literal.
-    const std::string& getPrintfText() const;
+    const std::string& getPrintfText() const { return parsedText; }
     // Where the piece stands in the format; for a literal in front of a "%", the place of the "%".
     unsigned long getFormatPosition() const { return formatPosition; }
 
@@ -116,7 +116,8 @@ private:
     static const FieldValidatorT<15, 17, 16, 18, 19> widthValidator;
     static const FieldValidatorT<20, 22, 21, 23, 24> precisionValidator;
 
-    std::unique_ptr<std::string> variants[variantCount];
+    // Owned, but for the first, which stands in the piece itself.
+    const std::string* variants[variantCount] = {};
     Variant variant = AsParsed;
     unsigned long numberedIndex;
     PrintFormatFlags flags;
@@ -130,6 +131,7 @@ private:
     unsigned long formatPosition;
     PrintfFormat conversion;
     PrintfSubformat subformat;
+    std::string parsedText;
 };
 
 }  // namespace Orvandeil::FileIO

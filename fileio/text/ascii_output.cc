@@ -1,14 +1,12 @@
 #include "fileio/text/ascii_output.h"
 
 #include "fileio/constants.h"
-#include "fileio/streams/file_stream.h"
-#include "fileio/text/output_string_stream.h"
+#include "fileio/text/known_streams.h"
 
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
 #include <stdio_ext.h>
-#include <typeinfo>
 #include <utility>
 
 #ifdef __SSE2__
@@ -20,11 +18,6 @@ namespace {
 
 bool isBlockBuffered(std::FILE* file) {
     return __flbf(file) == 0 && __fbufsize(file) > constants::elementBlockBytes;
-}
-
-template <class Stream>
-Stream* exactly(TcodnStream& out) {
-    return typeid(out) == typeid(Stream) ? static_cast<Stream*>(&out) : nullptr;
 }
 
 void widenAscii(const char* text, std::size_t count, char* out) {

@@ -7,6 +7,12 @@
 
 namespace Orvandeil::FileIO::detail {
 
+// The stream when it is exactly one of that class, else null.
+template <class Stream>
+Stream* exactly(TcodnStream& out) {
+    return typeid(out) == typeid(Stream) ? static_cast<Stream*>(&out) : nullptr;
+}
+
 // Whether the stream is exactly one of the library's own, so that how a text is cut into writes
 // shows nowhere. A class derived from them may watch its writes.
 inline bool isKnownStream(const TcodnStream& out) {

@@ -44,6 +44,12 @@ int outputScreenStream::printCommon(const char* format, std::va_list arguments) 
     return length;
 }
 
+int outputScreenStream::putFormatted(const char* text, std::size_t count) {
+    if (vxConsolePutString(text) == -1) return 0;
+    countWritten(count, count);
+    return static_cast<int>(count);
+}
+
 unsigned long outputScreenStream::PutNElements(unsigned long count, const void* buffer,
                                                unsigned long elementSize) {
     return PutNElementsCommon(count, buffer, elementSize);

@@ -28,6 +28,9 @@ public:
     int flush() override;
     virtual int printCommon(const char* format, std::va_list arguments);
 
+    // What print() does with a text that is formatted already and ends at its first NUL.
+    int putFormatted(const char* text, std::size_t count);
+
     std::size_t getConsoleBytesWritten() const { return bytesWritten; }
 
 protected:
