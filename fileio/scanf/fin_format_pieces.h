@@ -46,11 +46,11 @@ public:
     finFormatPieceCMATCH(const finFormatPieceInitBlock& init, std::size_t open);
     unsigned long scan(TcodnStream& input, OutputBuffer& result, bool hostFlag, bool& failed,
                        int& status) override;
+    bool accepts(char16_t character) const;
 
 private:
     friend struct LayoutProbe;
 
-    bool accepts(char16_t character) const;
     bool takeMatches(TcodnStream& input, OutputBuffer& result, bool& matched);
     void answerForAscii();
 

@@ -2,7 +2,7 @@
 
 #include "fileio/scanf/scan_program.h"
 
-#include <algorithm>
+#include <limits>
 #include <optional>
 #include <typeinfo>
 
@@ -81,11 +81,13 @@ bool scanControl::performMainScan() {
 // Into memory that is there: a piece asks for more, so that it alone fails for want of it.
 void scanControl::runProgram(const detail::ScanProgram& program) {
     std::size_t room = buffer->getFreeRoom();
-    if (!unlimited) room = std::min(room, limit - *count);
     if (room == 0) return;
-    auto* const values = static_cast<char*>(buffer->Allocate(room));
-    const detail::ScanProgram::Run run = program.run(parser->getNextIndex(), values, room);
-    buffer->SetLastChunkSize(run.values);
+    auto* const elements = static_cast<char*>(buffer->Allocate(room));
+    const unsigned long wanted =
+        unlimited ? std::numeric_limits<unsigned long>::max() : limit - *count;
+    const detail::ScanProgram::Run run =
+        program.run(parser->getNextIndex(), wanted, {elements, room});
+    buffer->SetLastChunkSize(run.elements);
     if (run.pieces == 0) return;
     *count += run.values;
     conversions += run.pieces;

@@ -1,40 +1,17 @@
 #include "fileio/host/text.h"
+#include "fileio/text/blanks.h"
 #include "fileio/text/tcodn_stream.h"
 #include "fileio/text/units_ahead.h"
 
 #include <algorithm>
-#include <array>
 #include <limits>
 
 namespace Orvandeil::FileIO {
 #ifdef FILEIO_FAST_PATHS
 namespace {
 
+using detail::Blanks;
 using Verdict = detail::UnitsAhead::Verdict;
-
-// The host's answers, those for ASCII asked for once.
-class Blanks {
-public:
-    Blanks() : ascii(asciiAnswers()) {}
-    bool has(char16_t unit) const {
-        return unit < ascii.size() ? ascii[unit] : qzu_isbreakablespace(unit);
-    }
-
-private:
-    using Answers = std::array<bool, 0x80>;
-
-    static const Answers& asciiAnswers() {
-        static const Answers answers = [] {
-            Answers asked{};
-            for (char16_t unit = 0; unit < asked.size(); ++unit)
-                asked[unit] = qzu_isbreakablespace(unit);
-            return asked;
-        }();
-        return answers;
-    }
-
-    const Answers& ascii;
-};
 
 }  // namespace
 

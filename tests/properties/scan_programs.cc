@@ -7,6 +7,7 @@
 #include "tests/support/test_files.h"
 
 #include <cerrno>
+#include <cstring>
 
 namespace properties {
 namespace {
@@ -19,10 +20,15 @@ struct PlainControl : scanControl {
     using scanControl::scanControl;
 };
 
-const std::string formats[] = {"%d",     "%d,%d",        "%f",       "%hd %hu,%u",  "%ld",
-                               "%lu",    "%lu%ld",       "%f;%hf\n", "a %d , b%fc", "%d%%%f",
-                               "%d%*f",  "%*d %u",       "%f%*[,;]", "%3d%f",       "%d%s",
-                               "%i %d ", "x%*f y%*dz%d", "%hf\t%ld", "%d\u00E9%f",  "%f\u2003%d"};
+const std::string formats[] = {"%d",          "%d,%d",      "%hd %hu,%u",    "%ld",
+                               "%lu",         "%lu%ld",     "%f;%hf\n",      "a %d , b%fc",
+                               "%d%%%f",      "%d%*f",      "%*d %u",        "%f%*[,;]",
+                               "%3d%f",       "%d%s",       "%i %d ",        "x%*f y%*dz%d",
+                               "%hf\t%ld",    "%d\u00E9%f", "%f\u2003%d",    "%f ",
+                               "%s",          "%3s%d",      "%s%2c",         "%[^,],",
+                               "%4[^,\n]%*c", "%c",         "%*s %3c",       "%*[^ ]%u",
+                               "%[0-9]%s",    "%5s,%hf",    "%*[^a]%[]a-f]", "%[acegikmo4]%c",
+                               "%[^\u00E9-a]"};
 const std::string encodings[] = {"", "UTF-8", "ISO-8859-1", "Shift_JIS", "UTF-16LE"};
 
 // Text that a format reads well, with a fault now and then.
@@ -40,8 +46,9 @@ public:
                 if ((format[i] == '%' || format[i] == ' ') && below(4) == 0)
                     result += " \n\t\v"[below(4)];
                 if (format[i] == '%' && format[++i] != '%') {
-                    i = format.find_first_of("dufis]", i);
-                    result += number();
+                    i = format.find_first_of("dufisc[", i);
+                    result += std::strchr("sc[", format[i]) == nullptr ? number() : word();
+                    if (format[i] == '[') i = format.find(']', i + 3);
                 } else {
                     result += format[i];
                 }
@@ -51,6 +58,14 @@ public:
     }
 
 private:
+    // Mostly longer than what is looked at in one go, or mostly shorter.
+    std::string word() {
+        std::string result;
+        const std::size_t others = below(3) == 0 ? 6 : 30;
+        for (std::size_t n = 1 + below(below(5) == 0 ? 40 : 9); n != 0; --n)
+            result += below(others) != 0 ? "abegmsxy0249"[below(12)] : ",. -]\n\xC3\xA9"[below(8)];
+        return result;
+    }
     std::string number() {
         std::string result = std::to_string(1 + below(9));
         for (std::size_t n = below(below(6) == 0 ? 30 : 9); n != 0; --n)
@@ -66,11 +81,12 @@ private:
 
 // Scans, steps back, and tells all that shows of it.
 template <class Control>
-std::string scanBy(TcodnStream& stream, const std::string& format, long limit, unsigned long back) {
+std::string scanBy(TcodnStream& stream, const std::string& format, long limit, unsigned long back,
+                   std::size_t chunk) {
     const std::u16string text = fileio_tests::toUtf16(format);
     finFormatParser parser(text.c_str(), &stream);
     parser.InitFormatPieces();
-    OutputBuffer buffer(parser.getResultClass(), 4, 4, 64);
+    OutputBuffer buffer(parser.getResultClass(), chunk, chunk, 64);
     unsigned long count = 0;
     Control control(static_cast<unsigned long>(limit), limit < 0, count, stream, parser, buffer);
     const bool result = control.performMainScan();
@@ -95,18 +111,19 @@ void scanPrograms(Bytes& input) {
     const std::string &format = input.of(formats), &encoding = input.of(encodings);
     const long limit = input.below(3) == 0 ? -1 : static_cast<long>(input.below(20));
     const bool canSeek = input.below(2) == 0;
-    const std::size_t readAhead = 1 + input.below(60);
+    const std::size_t readAhead = 1 + input.below(input.below(2) == 0 ? 60 : 200);
     const unsigned long back = 1 + input.below(3);
+    const std::size_t chunk = input.below(2) == 0 ? 4 : 64;
     const std::string text = inputs.text(format, input.below(40));
     const std::string where = format + " of " + text + " in " + encoding;
     const auto fromFile = [&](auto scan) {
         support::FaultyFile file{.bytes = text, .failingSeek = canSeek ? 0 : 1, .error = ESPIPE};
         support::OpenedFile opened(file.open("r", readAhead), "r", encoding);
-        return scan(opened.stream, format, limit, back);
+        return scan(opened.stream, format, limit, back, chunk);
     };
     const auto fromText = [&](auto scan) {
         inputStringStream stream(text.c_str(), std::ssize(text), encoding);
-        return scan(stream, format, limit, back);
+        return scan(stream, format, limit, back, chunk);
     };
     const std::string seen = fromFile(scanBy<scanControl>) + fromText(scanBy<scanControl>);
     requireEqual(seen, fromFile(scanBy<PlainControl>) + fromText(scanBy<PlainControl>), where);
