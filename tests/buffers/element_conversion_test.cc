@@ -19,17 +19,18 @@ using embedded::ArrayPtr;
 // The halves around all powers of two, and what is about halfway between two singles, where a step
 // over double would round twice.
 std::vector<long double> boundaries() {
-    std::vector<long double> values = {0x1.000001p60L,
-                                       0x1.000001p60L + 1,
-                                       0x1.000003p60L - 1,
-                                       0x1.000001p0L,
-                                       0x1.0000010000001p0L,
-                                       0x1.ffffffp127L,
-                                       1e300L,
-                                       5e-324L,
-                                       -0.L,
-                                       HUGE_VALL,
-                                       -HUGE_VALL};
+    constexpr long double odd[] = {0x1.000001p60L,
+                                   0x1.000001p60L + 1,
+                                   0x1.000003p60L - 1,
+                                   0x1.000001p0L,
+                                   0x1.0000010000001p0L,
+                                   0x1.ffffffp127L,
+                                   1e300L,
+                                   5e-324L,
+                                   -0.L,
+                                   HUGE_VALL,
+                                   -HUGE_VALL};
+    std::vector<long double> values(std::begin(odd), std::end(odd));
     for (int exponent = 0; exponent <= 66; ++exponent) {
         for (long double offset = -2; offset <= 2; offset += 0.5L) {
             values.push_back(std::ldexp(1.L, exponent) + offset);

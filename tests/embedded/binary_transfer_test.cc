@@ -2,17 +2,13 @@
 #include "embedded/builtins/binary_write.h"
 #include "embedded/builtins/open_close.h"
 #include "embedded/builtins/positioning.h"
-#include "fileio/buffers/element_conversion.h"
 #include "fileio/errors/code_list.h"
 #include "tests/support/arrays.h"
 #include "tests/support/raised.h"
 #include "tests/support/test_files.h"
 
-#include <algorithm>
 #include <cerrno>
 #include <cmath>
-#include <random>
-#include <span>
 #include <string>
 #include <unistd.h>
 
@@ -66,47 +62,6 @@ TEST(BinaryTransfer, RefusesTheWrongDirection) {
     // Only the permission "w" asks for a flush after every write.
     EXPECT_EQ(write(*openFile("/dev/full", {"w", "n", ""}), "uint8", makeScalar(1))->code, ENOSPC);
     EXPECT_FALSE(write(*openFile("/dev/full", {"W", "n", ""}), "uint8", makeScalar(1)));
-}
-
-// Reads of many pieces, with ends and skips anywhere, against taking one element at a time.
-TEST(BinaryRead, AgreesWithOneElementAtATime) {
-    std::mt19937_64 random(3);
-    std::string bytes(300000, '\0');
-    std::ranges::generate(bytes, [&] { return static_cast<char>(random()); });
-    const TempFile content(bytes);
-    const vxClassID classes[] = {vxUINT8_CLASS, vxINT16_CLASS, vxSINGLE_CLASS, vxDOUBLE_CLASS};
-    for (int round = 0; round < 150; ++round) {
-        const vxClassID from = classes[random() % 4], to = classes[random() % 4];
-        const std::size_t size = elementBytes(from), start = random() % 9;
-        const std::size_t skip = random() % 2 * (random() % 40), block = 1 + random() % 5;
-        const std::size_t limit = random() % 2 == 0 ? random() % 100000 : bytes.size();
-        const bool isBig = random() % 2 == 0;
-        std::string expected;
-        std::size_t place = start, end = start, count = 0;
-        for (; count < limit && place + size <= bytes.size(); end = place += size) {
-            if (count != 0 && count % block == 0 && (place += skip) + size > bytes.size()) break;
-            std::string element = bytes.substr(place, size);
-            if (isBig) std::ranges::reverse(element);
-            expected.resize(expected.size() + elementBytes(to));
-            AssignToVoidBuffer(to, &expected.end()[-static_cast<long>(elementBytes(to))], from,
-                               element.data(), 1);
-            ++count;
-        }
-        auto file = open(content, "r");
-        seek(*file, static_cast<double>(start), Origin::Begin);
-        const std::string precision = std::to_string(block) + '*' + nameOfClass(from) + "=>";
-        const ReadResult result = readBinary(
-            *file, ReadAttributes(precision + nameOfClass(to), MachineFormat(isBig ? "b" : "l"),
-                                  makeScalar(static_cast<double>(limit)).get(),
-                                  makeScalar(static_cast<double>(skip)).get()));
-        SCOPED_TRACE(precision + nameOfClass(to) + ", round " + std::to_string(round));
-        ASSERT_EQ(result.count, count);
-        ASSERT_FALSE(result.failure);
-        const auto* data = static_cast<const char*>(vxArrayData(result.array.get()));
-        ASSERT_TRUE(std::ranges::equal(expected, std::span(data, expected.size())));
-        ASSERT_EQ(endOfFile(*file), count < limit);
-        ASSERT_TRUE(count < limit || tell(*file) == static_cast<long>(end));
-    }
 }
 
 TEST(BitFields, ThatCannotBeSettledAreTold) {

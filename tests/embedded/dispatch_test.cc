@@ -42,13 +42,7 @@ TEST(Dispatch, StringElements) {
 }
 
 TEST(Dispatch, Conversions) {
-    const ArrayPtr word = makeString(u"4e1");
-    EXPECT_EQ(call("char", word), "char 1x3: 52 101 49");
-    EXPECT_EQ(call("string", word), "string 1x1: '4e1'");
-    for (const char* name : {"int64", "uint64", "int8"})
-        EXPECT_EQ(call(name, word), "none");
-    for (const char* name : {"char", "int64", "uint64"})
-        EXPECT_EQ(call(name, makeString(std::nullopt)), "KESTRA:string:MissingNotSupported");
+    EXPECT_EQ(call("int8", makeString(u"4e1")), "none");
     EXPECT_EQ(call("char", makeStrings({u"a", u"b"}, {1, 2})),
               "KESTRA:string:MustBeStringScalarOrCharacterVector");
     EXPECT_EQ(call("double", makeRow<std::int8_t>(vxINT8_CLASS, {-3, 5})), "double 1x2: -3 5");

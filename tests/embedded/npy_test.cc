@@ -38,30 +38,17 @@ std::string errorFor(const std::string& content) {
     return raised.substr(0, raised.find(' '));
 }
 
-TEST(Npy, ReadsTypesInBothByteOrdersAndAllVersions) {
+TEST(Npy, ReadsComplexTypesInAllVersions) {
     const struct {
         int line;
         const char* type;
         std::string_view data;  // two elements
         const char* expected;
-    } rows[] = {
-        {__LINE__, "|b1", "\0\x02"sv, "logical 2x1: 0 1"},
-        {__LINE__, "|i1", "\x80\x7F"sv, "int8 2x1: -128 127"},
-        {__LINE__, "<i2", "\x01\x02\xFE\xFF"sv, "int16 2x1: 513 -2"},
-        {__LINE__, ">i2", "\x01\x02\xFF\xFE"sv, "int16 2x1: 258 -2"},
-        {__LINE__, ">u2", "\x01\x02\xFF\xFE"sv, "uint16 2x1: 258 65534"},
-        {__LINE__, "=i4", "\1\0\0\0\xFF\xFF\xFF\xFF"sv, "int32 2x1: 1 -1"},
-        {__LINE__, ">u4", "\0\0\0\1\xFF\xFF\xFF\xFF"sv, "uint32 2x1: 1 4294967295"},
-        {__LINE__, ">i8", "\0\0\0\0\0\0\0\1\xFF\xFF\xFF\xFF\xFF\xFF\xFF\xFE"sv, "int64 2x1: 1 -2"},
-        {__LINE__, "<u8", "\1\0\0\0\0\0\0\0\0\0\0\0\1\0\0\0"sv, "uint64 2x1: 1 4294967296"},
-        {__LINE__, "<f4", "\0\0\x80\x3F\0\0\x20\xC0"sv, "single 2x1: 1 -2.5"},
-        {__LINE__, ">f4", "\x3F\x80\0\0\xC0\x20\0\0"sv, "single 2x1: 1 -2.5"},
-        {__LINE__, ">f8", "\x3F\xF0\0\0\0\0\0\0\xC0\4\0\0\0\0\0\0"sv, "double 2x1: 1 -2.5"},
-        {__LINE__, ">c8", "\x3F\x80\0\0\xC0\x20\0\0\0\0\0\0\x40\0\0\0"sv,
-         "single 2x1: 1 0 + i -2.5 2"},
-        {__LINE__, "<c16",
-         "\0\0\0\0\0\0\xF0\x3F\0\0\0\0\0\0\4\xC0\0\0\0\0\0\0\0\0\0\0\0\0\0\0\0\x40"sv,
-         "double 2x1: 1 0 + i -2.5 2"}};
+    } rows[] = {{__LINE__, ">c8", "\x3F\x80\0\0\xC0\x20\0\0\0\0\0\0\x40\0\0\0"sv,
+                 "single 2x1: 1 0 + i -2.5 2"},
+                {__LINE__, "<c16",
+                 "\0\0\0\0\0\0\xF0\x3F\0\0\0\0\0\0\4\xC0\0\0\0\0\0\0\0\0\0\0\0\0\0\0\0\x40"sv,
+                 "double 2x1: 1 0 + i -2.5 2"}};
     for (const auto& row : rows) {
         for (const int version : {1, 2, 3})
             EXPECT_EQ(shown(readText(npyText(version, dictionary(row.type, "(2,)"), row.data))),

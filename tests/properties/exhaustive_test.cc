@@ -1,15 +1,14 @@
 #include "embedded/services/array.h"
-#include "fileio/host/memory.h"
 #include "fileio/printf/print_format_parser.h"
-#include "fileio/printf/printf_controller.h"
 #include "fileio/scanf/scan_control.h"
 #include "fileio/text/input_string_stream.h"
-#include "fileio/text/output_string_stream.h"
 #include "tests/properties/properties.h"
+#include "tests/support/printing.h"
 
 #include <algorithm>
 #include <bit>
 #include <cmath>
+#include <cstdio>
 #include <cstdlib>
 #include <regex>
 #include <string>
@@ -69,17 +68,21 @@ TEST(Exhaustive, UnitsAndPairsOfBytesOfEveryConverter) {
     }
 }
 
-std::string printed(const float* values, std::size_t count) {
-    const embedded::ArrayPtr array = embedded::makeNumeric(vxSINGLE_CLASS, {count, 1});
-    std::copy_n(values, count, static_cast<float*>(embedded::realData(*array)));
-    const vxArray* arguments[] = {array.get()};
-    outputStringStream out("US-ASCII");
-    printfController(u"%.9g\n", &out, arguments, 1).doPrintf();
-    long bytes = 0;
-    out.getPosition(bytes);
-    void* const block = out.transferBuffer();
-    std::string text(static_cast<char*>(block), static_cast<std::size_t>(bytes));
-    vxMemoryFree(block);
+// By this library and by the C library.
+std::string printed(const std::vector<float>& values) {
+    const embedded::ArrayPtr array = embedded::makeNumeric(vxSINGLE_CLASS, {values.size(), 1});
+    std::ranges::copy(values, static_cast<float*>(embedded::realData(*array)));
+    const std::string text = fileio_tests::print("%.9g\n", array).text;
+    std::string wanted;
+    for (const float value : values) {
+        char digits[32];
+        std::snprintf(digits, sizeof digits, "%.9g\n", value);
+        wanted += std::isfinite(value) ? digits
+                  : std::isnan(value)  ? "NaN\n"
+                  : value < 0          ? "-Inf\n"
+                                       : "Inf\n";
+    }
+    EXPECT_TRUE(text == wanted);
     return text;
 }
 
@@ -91,7 +94,7 @@ TEST(Exhaustive, SinglesThroughPrintAndScan) {
     for (std::uint64_t bits = 0; bits <= UINT32_MAX; bits += step) {
         values.push_back(std::bit_cast<float>(static_cast<std::uint32_t>(bits)));
         if (values.size() != pieceSize && bits + step <= UINT32_MAX) continue;
-        const std::string text = printed(values.data(), values.size());
+        const std::string text = printed(values);
         inputStringStream in(text.c_str(), std::ssize(text), "");
         finFormatParser parser(u"%f", &in);
         parser.InitFormatPieces();

@@ -9,12 +9,14 @@
 #include "tests/support/raised.h"
 #include "tests/support/test_files.h"
 
+#include <bit>
 #include <cctype>
 #include <cerrno>
 #include <cmath>
 #include <cstdio>
 #include <cstring>
 #include <optional>
+#include <random>
 #include <type_traits>
 
 // The C library's printf is the referee for whatever a number looks like. A stream of a class that
@@ -95,20 +97,14 @@ std::string anyStart(Bytes& input, std::size_t width) {
     return start;
 }
 
-// An array through one conversion between literals.
-void againstC(Bytes& input) {
-    static const std::string around[] = {"", " ", ",", "\n", "x = ", "é"};
-    const std::size_t width = input.below(3) == 0 ? input.below(40) : 0;
-    const std::string start = anyStart(input, width);
-    const char conversion = input.of(std::string_view("diouxXeEfgG"));
-    const std::string before = input.of(around), after = input.of(around);
-    const ArrayPtr array = anyNumbers(input, input.of(classes));
+// The elements of an array, each through one conversion between literals.
+void compareWithC(Bytes& input, const ArrayPtr& array, const std::string& before,
+                  const std::string& start, int width, char conversion, const std::string& after) {
     std::string wanted;
     const auto append = [&]<class T>(ElementType<T>) {
         for (std::size_t i = 0; i < elementCount(*array); ++i) {
             const T value = static_cast<const T*>(vxArrayData(array.get()))[i];
-            wanted +=
-                before + expectedNumber(start, conversion, static_cast<int>(width), value) + after;
+            wanted += before + expectedNumber(start, conversion, width, value) + after;
         }
     };
     withElementType(vxArrayClassID(array.get()), append, [] {});
@@ -116,6 +112,48 @@ void againstC(Bytes& input) {
     const std::string text = fileio_tests::print(format, array).summary();
     if (!wanted.empty()) requireEqual(text, wanted, format);
     input.observe(text);
+}
+
+// Values that are hard in their own ways: any bits, few decimals, halves, decimal halves,
+// neighbours of powers of ten, whole numbers, singles.
+double hardNumber(std::size_t kind, std::mt19937_64& random) {
+    const auto power = [&](unsigned count) { return std::pow(10, random() % count); };
+    switch (kind) {
+        case 0:
+            return std::bit_cast<double>(random());
+        case 1:
+            return (static_cast<double>(random() % 20000001) - 10000000) / power(9);
+        case 2:
+            return std::ldexp(random() >> (11 + random() % 53),
+                              static_cast<int>(random() % 120) - 80);
+        case 3:
+            return (static_cast<double>(random() >> (20 + random() % 40)) * 10 + 5) * power(6);
+        case 4:
+            return std::nextafter(std::pow(10, static_cast<int>(random() % 632) - 323),
+                                  random() % 2 == 0 ? 0 : INFINITY);
+        case 5:
+            return static_cast<double>(static_cast<long>(random()) >> random() % 64);
+        default:
+            return std::bit_cast<float>(static_cast<std::uint32_t>(random()));
+    }
+}
+
+void againstC(Bytes& input) {
+    static const std::string around[] = {"", " ", ",", "\n", "x = ", "é"};
+    const std::size_t width = input.below(3) == 0 ? input.below(40) : 0;
+    const std::string start = anyStart(input, width);
+    const char conversion = input.of(std::string_view("diouxXeEfgG"));
+    const std::string before = input.of(around), after = input.of(around);
+    const ArrayPtr array = anyNumbers(input, input.of(classes));
+    compareWithC(input, array, before, start, static_cast<int>(width), conversion, after);
+    if (input.empty()) return;
+    const ArrayPtr hard = makeNumeric(vxDOUBLE_CLASS, {1, 50});
+    const std::size_t kind = input.below(7);
+    std::mt19937_64 random(input.number(8));
+    for (std::size_t i = 0; i < 50; ++i)
+        static_cast<double*>(realData(*hard))[i] = hardNumber(kind, random);
+    const std::string precision = "%." + std::to_string(input.below(18));
+    compareWithC(input, hard, "", precision, 0, input.of(std::string_view("efg")), "\n");
 }
 
 // What shows of a call but its text.
@@ -152,12 +190,7 @@ std::string printToString(const std::string& encoding, const std::u16string& for
         if (failures.allocation != 0) failing.emplace(failures.allocation);
         end = print(out, format, arguments) + (failing && failing->happened() ? " failed" : "");
     }
-    long bytes = 0;
-    out.getPosition(bytes);
-    void* const block = out.transferBuffer();
-    const std::string text(static_cast<char*>(block), static_cast<std::size_t>(bytes));
-    vxMemoryFree(block);
-    return text + end;
+    return fileio_tests::taken(out) + end;
 }
 
 template <class Stream>

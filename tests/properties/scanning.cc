@@ -2,7 +2,11 @@
 
 #include "fileio/text/input_string_stream.h"
 #include "tests/properties/properties.h"
+#include "tests/support/printing.h"
+#include "tests/support/test_files.h"
+#include "tests/text/memory_stream.h"
 
+#include <cerrno>
 #include <cstdio>
 
 namespace properties {
@@ -39,16 +43,34 @@ std::string scanText(const std::string& text, const std::string& encoding,
     return finish(stream, scanned);
 }
 
+// Lines and scans in turn.
+std::string readOn(fileStream& stream, const std::string& format) {
+    std::string seen;
+    for (int turn = 0; turn < 6; ++turn) {
+        OutputBuffer line(vxCHAR_CLASS, 16, 16, 64);
+        seen += " line " + std::to_string(stream.GetLine(turn % 2 == 0 ? -1 : 7, line)) + ' ';
+        const std::size_t units = line.GetSize();
+        const auto text = line.Transfer();
+        if (units != 0) seen += bytesOf({static_cast<const char16_t*>(text.get()), units});
+        seen += ' ' + support::scan(stream, format, 2).summary() + ' ' +
+                std::to_string(stream.EndOfData());
+    }
+    return seen;
+}
+
 template <class Stream>
 std::string scanFile(const std::string& text, const std::string& encoding,
-                     const std::string& format, long limit, std::size_t bufferSize) {
-    support::FaultyFile memory{.bytes = text};
+                     const std::string& format, long limit, std::size_t bufferSize,
+                     bool canSeek = true, bool readsOn = false) {
+    support::FaultyFile memory{.bytes = text, .failingSeek = canSeek ? 0 : 1, .error = ESPIPE};
     std::FILE* const file = memory.open("r", bufferSize);
     FilePermission permission;
     std::string seen;
     {
         Stream stream(file, encoding.empty() ? "UTF-8" : encoding, permission, u"");
-        seen = finish(stream, support::scan(stream, format, limit));
+        const Scanned scanned = support::scan(stream, format, limit);
+        if (readsOn) seen = readOn(stream, format);
+        seen += finish(stream, scanned);
     }
     std::fclose(file);
     return seen;
@@ -102,6 +124,19 @@ void scanning(Bytes& input) {
     requireEqual(inFile, scanFile<UnknownFileStream>(text, encoding, format, limit, bufferSize),
                  where + " in a file");
     input.observe(seen + inFile);
+    if (input.empty()) return;
+    // The same text in any encoding, by scans and lines in turn, from what may be a pipe.
+    const std::string name = input.of(statelessEncodings);
+    MemoryStream encoder(name);
+    encoder.PutString(fileio_tests::toUtf16(text));
+    const bool canSeek = input.below(2) == 0;
+    const std::size_t readAhead = 1 + input.below(100);
+    std::string bytes = encoder.output;
+    for (std::size_t faults = input.below(3); faults > 0 && !bytes.empty(); --faults)
+        bytes[input.below(256) % bytes.size()] = "\xC3\xFF\x81\0,"[input.below(5)];
+    requireEqual(scanFile<fileStream>(bytes, name, format, limit, readAhead, canSeek, true),
+                 scanFile<UnknownFileStream>(bytes, name, format, limit, readAhead, canSeek, true),
+                 where + " in turn with lines, in " + name);
 }
 
 // Formats with texts made for them: a file gives what a text gives, and every field is stored.

@@ -3,9 +3,6 @@
 
 #include <algorithm>
 
-#include <unicode/unistr.h>
-#include <unicode/utf16.h>
-
 namespace properties {
 namespace {
 
@@ -14,20 +11,6 @@ using namespace Orvandeil::FileIO;
 const char* anyConverter(Bytes& input) {
     const auto count = static_cast<std::size_t>(ucnv_countAvailable());
     return ucnv_getAvailableName(static_cast<int>(input.below(count)));
-}
-
-icu::UnicodeString unitsOf(const char* encoding, std::string_view bytes) {
-    return {bytes.data(), static_cast<int>(bytes.size()), encoding};
-}
-
-// ICU over the whole text, then pairs and lone surrogates to one U+001A.
-std::u16string decodedAtOnce(const char* encoding, std::string_view bytes) {
-    const icu::UnicodeString text = unitsOf(encoding, bytes);
-    std::u16string units(text.getBuffer(), static_cast<std::size_t>(text.length()));
-    std::erase_if(units, [](char16_t unit) { return U16_IS_TRAIL(unit); });
-    const auto isLead = [](char16_t unit) { return U16_IS_LEAD(unit); };
-    std::replace_if(units.begin(), units.end(), isLead, u'\x1A');
-    return units;
 }
 
 // Reads in steps of any size, and never across a boundary.

@@ -40,50 +40,6 @@ std::string describe(const finFormatPiece& piece) {
            (piece.getWidth() > 0 ? std::to_string(piece.getWidth()) : "");
 }
 
-// What each piece is, the class of the result, the error.
-TEST(FinFormatParser, Pieces) {
-    const struct {
-        int line;
-        const char* format;
-        const char* expected;
-    } rows[] = {
-        {__LINE__, "", "error() 4 -8"},
-        {__LINE__, "%d,%*d", "integer(%d) literal(,) integer(%d)* 6 0"},
-        {__LINE__, "%*3ld", "integer(%3ld)*3 14 0"},
-        {__LINE__, "%99999999999d", "integer(%99999999999d)2147483647 6 0"},
-        {__LINE__, "%5.2f", "error(%5.2f) 4 -8"},
-        {__LINE__, "a%d%q", "literal(a) integer(%d) error(%q) 6 -8"},
-        // The order decides the class.
-        {__LINE__, "%s%ld", "string(%s) integer(%ld) 14 0"},
-        {__LINE__, "%ld%s", "integer(%ld) string(%s) 6 0"},
-        {__LINE__, "%ld%lu", "integer(%ld) unsigned(%lu) 6 0"},
-        {__LINE__, "%*d%ld", "integer(%d)* integer(%ld) 6 0"},
-        // Sets.
-        {__LINE__, "%[]a]", "scanset(%[]a]) 4 0"},
-        {__LINE__, "%[^]a]b", "scanset(%[^]a]) literal(b) 4 0"},
-        {__LINE__, "%*3[a^]]", "scanset(%3[a^])*3 literal(]) 4 0"},
-        // Percent signs.
-        {__LINE__, "a%%%d", "literal(a%%) integer(%d) 6 0"},
-        {__LINE__, "%%a", "literal(%%) literal(a) 4 0"},
-        {__LINE__, "%%%d", "literal(%%) integer(%d) 6 0"},
-        {__LINE__, "%%a%d", "literal(%%a%d) 4 0"},
-        {__LINE__, "%d%% %d", "integer(%d) literal(%% %d) 6 0"},
-        {__LINE__, "%%a%%d", "integer(%%a%%d) 6 0"},
-        {__LINE__, "%%a%%*2[x]", "scanset(%%a%%2[x])*2 4 0"},
-        {__LINE__, "%%%", "literal(%%) error(%) 4 -8"},
-        {__LINE__, "%%%%", "error(%%%%) 4 -8"},
-    };
-    for (const auto& row : rows) {
-        Parsed parsed(fileio_tests::toUtf16(row.format));
-        std::string found;
-        for (std::size_t i = 0; i < parsed.parser.getPieceCount(); ++i)
-            found += describe(parsed.piece(i)) + ' ';
-        found += std::to_string(parsed.parser.getResultClass()) + ' ' +
-                 std::to_string(parsed.parser.getError());
-        EXPECT_EQ(found, row.expected) << "line " << row.line;
-    }
-}
-
 // Every letter with every length letter: what it reads, and into which class.
 TEST(FinFormatParser, Conversions) {
     const std::u16string letters = u"diuxXoefgEGsc", prefixes = u"hl%*-[0123456789";

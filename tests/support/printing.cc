@@ -17,6 +17,15 @@ std::string toUtf8(std::u16string_view text) {
     return vxTextToNarrow(text.data(), text.size());
 }
 
+std::string taken(outputStringStream& stream) {
+    long bytes = 0;
+    stream.getPosition(bytes);
+    void* const block = stream.transferBuffer();
+    const std::string text(static_cast<const char*>(block), static_cast<std::size_t>(bytes));
+    vxMemoryFree(block);
+    return text;
+}
+
 Printed print(std::string_view format, const std::vector<const vxArray*>& arguments) {
     outputStringStream out("");
     std::vector<const vxArray*> list = arguments;
@@ -24,12 +33,10 @@ Printed print(std::string_view format, const std::vector<const vxArray*>& argume
     Printed result;
     result.complete = controller.doPrintf();
     result.code = controller.getErrorCode();
-    long bytes = 0;
-    out.getPosition(bytes);
-    void* block = out.transferBuffer();
-    result.text =
-        toUtf8({static_cast<const char16_t*>(block), static_cast<std::size_t>(bytes) / 2});
-    vxMemoryFree(block);
+    const std::string bytes = taken(out);
+    std::u16string units(bytes.size() / 2, u'\0');
+    bytes.copy(reinterpret_cast<char*>(units.data()), bytes.size());
+    result.text = toUtf8(units);
     return result;
 }
 

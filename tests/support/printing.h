@@ -1,6 +1,7 @@
 #pragma once
 
 #include "embedded/services/array.h"
+#include "fileio/text/output_string_stream.h"
 
 #include <string>
 #include <string_view>
@@ -10,6 +11,9 @@
 namespace fileio_tests {
 
 using Orvandeil::FileIO::embedded::ArrayPtr;
+
+// What was written to a string, which is empty then.
+std::string taken(Orvandeil::FileIO::outputStringStream& stream);
 
 struct Printed {
     std::string text;  // UTF-8; NUL as it is

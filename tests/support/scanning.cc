@@ -4,6 +4,7 @@
 #include "fileio/text/input_string_stream.h"
 #include "tests/support/arrays.h"
 #include "tests/support/printing.h"
+#include "tests/support/test_files.h"
 
 namespace support {
 
@@ -36,7 +37,8 @@ Scanned scan(TcodnStream& stream, std::string_view format, long limit) {
     return scanned;
 }
 
-Scanned scanBytes(FaultyFile file, std::string_view format, long limit) {
+Scanned scanFile(std::string_view input, std::string_view format, long limit) {
+    FaultyFile file{.bytes = std::string(input)};
     OpenedFile opened(file.open("r", 5), "r", "UTF-8");
     return scan(opened.stream, format, limit);
 }

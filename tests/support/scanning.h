@@ -2,9 +2,7 @@
 
 #include "fileio/buffers/output_buffer.h"
 #include "fileio/text/tcodn_stream.h"
-#include "tests/support/test_files.h"
 
-#include <cerrno>
 #include <string>
 #include <string_view>
 
@@ -27,15 +25,8 @@ struct Scanned {
 // Scans by `format` (UTF-8, as it stands) up to `limit` values.
 Scanned scan(Orvandeil::FileIO::TcodnStream& stream, std::string_view format, long limit);
 
-// The same over a file, a file that cannot seek, and a text in memory; read-ahead of a few bytes.
-Scanned scanBytes(FaultyFile file, std::string_view format, long limit);
-inline Scanned scanFile(std::string_view input, std::string_view format, long limit) {
-    return scanBytes({.bytes = std::string(input)}, format, limit);
-}
-inline Scanned scanPipe(std::string_view input, std::string_view format, long limit) {
-    const std::string bytes(input);
-    return scanBytes({.bytes = bytes, .failingSeek = 1, .error = ESPIPE}, format, limit);
-}
+// The same over a file, with a read-ahead of a few bytes, and over a text in memory.
+Scanned scanFile(std::string_view input, std::string_view format, long limit);
 Scanned scanText(std::string_view input, std::string_view format, long limit);
 
 }  // namespace support

@@ -7,11 +7,28 @@
 #include <string_view>
 #include <vector>
 
+#include <unicode/unistr.h>
+#include <unicode/utf16.h>
+
 namespace Orvandeil::FileIO {
 
 inline const char* const statelessEncodings[] = {"UTF-8",    "CESU-8",    "Shift_JIS",  "UTF-16LE",
                                                  "UTF-16BE", "GB18030",   "ISO-8859-1", "US-ASCII",
                                                  "EUC-JP",   "Big5-HKSCS"};
+
+inline icu::UnicodeString unitsOf(const char* encoding, std::string_view bytes) {
+    return {bytes.data(), static_cast<int>(bytes.size()), encoding};
+}
+
+// ICU over the whole text, then pairs and lone surrogates to one U+001A.
+inline std::u16string decodedAtOnce(const char* encoding, std::string_view bytes) {
+    const icu::UnicodeString text = unitsOf(encoding, bytes);
+    std::u16string units(text.getBuffer(), static_cast<std::size_t>(text.length()));
+    std::erase_if(units, [](char16_t unit) { return U16_IS_TRAIL(unit); });
+    const auto isLead = [](char16_t unit) { return U16_IS_LEAD(unit); };
+    std::replace_if(units.begin(), units.end(), isLead, u'\x1A');
+    return units;
+}
 
 // Reads a text that the caller keeps, in one read never across `boundary`, and collects what is
 // written up to a limit.

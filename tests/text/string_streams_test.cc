@@ -1,27 +1,21 @@
 #include "embedded/services/memory.h"
 #include "fileio/text/input_string_stream.h"
 #include "fileio/text/output_string_stream.h"
+#include "tests/support/printing.h"
 
 #include <cstdint>
-#include <cstring>
 
 #include <gtest/gtest.h>
 
 namespace Orvandeil::FileIO {
 namespace {
 
+using fileio_tests::taken;
+
 long positionOf(stream& any) {
     long position = -1;
     EXPECT_EQ(any.getPosition(position), 0);
     return position;
-}
-
-std::string take(outputStringStream& stream) {
-    std::string bytes(static_cast<std::size_t>(positionOf(stream)), '\0');
-    void* block = stream.transferBuffer();
-    if (block) std::memcpy(bytes.data(), block, bytes.size());
-    vxMemoryFree(block);
-    return bytes;
 }
 
 // Fills the present block to its end, and returns its size.
@@ -38,7 +32,7 @@ TEST(OutputStringStream, GrowsByItsCapacityAndTheNeed) {
             EXPECT_EQ(stream.PutNElements(count, std::string(count, 'a').data(), 1), count);
         const long capacity = fill(stream);
         EXPECT_EQ(stream.PutNElements(1, "z", 1), 1U) << "the block outlives the failure";
-        EXPECT_EQ(take(stream).back(), 'z');
+        EXPECT_EQ(taken(stream).back(), 'z');
         return capacity;
     };
     EXPECT_EQ(capacityAfter({1024}), 1024);
@@ -54,11 +48,11 @@ TEST(OutputStringStream, HandsItsBlockOver) {
         outputStringStream stream("ISO-8859-1");
         EXPECT_EQ(stream.transferBuffer(), nullptr);
         stream.PutString(u"h\u00E9llo");
-        EXPECT_EQ(take(stream), "h\xE9llo");
+        EXPECT_EQ(taken(stream), "h\xE9llo");
         stream.PutString(u"again");
         EXPECT_EQ(fill(stream), 1024);
         stream.Rewind(1019);
-        EXPECT_EQ(take(stream), "again");
+        EXPECT_EQ(taken(stream), "again");
         stream.PutString(u"gone");
         stream.Rewind(4);
         EXPECT_EQ(stream.transferBuffer(), nullptr);
@@ -71,7 +65,7 @@ TEST(OutputStringStream, PrintsInItsEncoding) {
     outputStringStream string("");
     EXPECT_EQ(string.printf("%.1f", 0.5), 3);
     EXPECT_EQ(string.printf("%s", "caf\xE9"), 0);
-    EXPECT_EQ(take(string), std::string("0\0.\0005\0", 6));
+    EXPECT_EQ(taken(string), std::string("0\0.\0005\0", 6));
 }
 
 TEST(InputStringStream, GivesBytesAndTakesNone) {

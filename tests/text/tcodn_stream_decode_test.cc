@@ -2,23 +2,11 @@
 #include "tests/text/memory_stream.h"
 
 #include <gtest/gtest.h>
-#include <unicode/unistr.h>
-#include <unicode/utf16.h>
 
 namespace Orvandeil::FileIO {
 namespace {
 
 using namespace std::literals;
-
-// ICU over the whole text, then pairs and lone surrogates to one U+001A.
-std::u16string decodedAtOnce(const char* encoding, std::string_view bytes) {
-    const icu::UnicodeString text(bytes.data(), static_cast<int>(bytes.size()), encoding);
-    std::u16string units(text.getBuffer(), static_cast<std::size_t>(text.length()));
-    std::erase_if(units, [](char16_t unit) { return U16_IS_TRAIL(unit); });
-    const auto isLead = [](char16_t unit) { return U16_IS_LEAD(unit); };
-    std::replace_if(units.begin(), units.end(), isLead, u'\x1A');
-    return units;
-}
 
 std::u16string contents(OutputBuffer& buffer) {
     std::u16string units;
