@@ -1,4 +1,5 @@
 #include "fileio/streams/file_stream.h"
+#include "fileio/text/mixed_utf8.h"
 #include "fileio/text/units_ahead.h"
 
 #include <algorithm>
@@ -24,6 +25,27 @@ std::size_t lengthOfBody(std::string_view bytes) {
     const void* const carriage = std::memchr(bytes.data(), carriageReturn, bytes.size());
     if (carriage) bytes = {bytes.data(), static_cast<const char*>(carriage)};
     return bytes.size();
+}
+
+struct Body {
+    detail::Progress decoded;
+    bool isWhole;  // a terminator follows
+};
+
+Body decodeBody(detail::DirectForm form, std::string_view bytes, char16_t* units,
+                std::size_t room) {
+    detail::Progress done{0, 0};
+    if (form == detail::DirectForm::Utf8) {
+        done = detail::decodeMixedUtf8Line(bytes.data(), bytes.size(), units, room);
+        bytes.remove_prefix(done.taken);
+        const bool atEnd = !bytes.empty() && (bytes[0] == lineFeed || bytes[0] == carriageReturn);
+        if (atEnd) return {done, true};
+    }
+    const std::size_t body = lengthOfBody(bytes);
+    const detail::Progress rest = detail::decodeDirectly(form, nullptr, bytes.data(), body,
+                                                         units + done.made, room - done.made);
+    const bool isWhole = rest.taken == body && body != bytes.size();
+    return {{done.taken + rest.taken, done.made + rest.made}, isWhole};
 }
 #endif
 
@@ -65,12 +87,12 @@ long fileStream::takeOfLine(long limit, OutputBuffer& out, int& result) {
     if (bytes.empty()) return 0;
     const char* const end = bytes.data() + bytes.size();
     auto* const units = static_cast<char16_t*>(out.Allocate(room));
-    const std::size_t body = lengthOfBody(bytes);
-    auto [taken, made] = detail::decodeDirectly(form, nullptr, bytes.data(), body, units, room);
-    const char* next = bytes.data() + taken;
+    const Body body = decodeBody(form, bytes, units, room);
+    const char* next = bytes.data() + body.decoded.taken;
+    std::size_t made = body.decoded.made;
     std::size_t givenBack = 0;
     // The terminator, what follows it, and room for both.
-    if (taken == body && end - next >= 2 && room - made >= 2) {
+    if (body.isWhole && end - next >= 2 && room - made >= 2) {
         char16_t following = 0;
         givenBack = ahead.decodeUnit(form, next + 1, end, following);
         if (givenBack != 0) result = 1;

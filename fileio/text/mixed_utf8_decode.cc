@@ -3,10 +3,11 @@
 #if defined(FILEIO_FAST_PATHS) && defined(__x86_64__)
 
 #include <array>
+#include <bit>
 #include <cstdint>
 #include <tmmintrin.h>
 
-#define FILEIO_FOR_SSSE3 [[gnu::target("ssse3")]]
+#define FILEIO_FOR_SSSE3 [[gnu::target("ssse3,popcnt")]]
 
 namespace Orvandeil::FileIO::detail {
 namespace {
@@ -120,14 +121,26 @@ FILEIO_FOR_SSSE3 void widen(__m128i block, char16_t* out) {
     _mm_storeu_si128(target + 1, _mm_unpackhi_epi8(block, _mm_setzero_si128()));
 }
 
+// As bits, the bytes that end a line.
+FILEIO_FOR_SSSE3 unsigned lineEnds(__m128i block) {
+    const __m128i feeds = _mm_cmpeq_epi8(block, _mm_set1_epi8('\n'));
+    const __m128i carriages = _mm_cmpeq_epi8(block, _mm_set1_epi8('\r'));
+    return static_cast<unsigned>(_mm_movemask_epi8(_mm_or_si128(feeds, carriages)));
+}
+
+// Goes to the end of a line only, if asked to.
+template <bool isLine>
 FILEIO_FOR_SSSE3 Progress decodeWindows(const char* bytes, std::size_t count, char16_t* out,
                                         std::size_t room) {
     std::size_t taken = 0;
     std::size_t made = 0;
     while (count - taken >= loadedBytes && room - made >= loadedBytes) {
         const __m128i block = load(bytes + taken);
+        const unsigned ends = isLine ? lineEnds(block) : 0;
+        const auto endsAt = static_cast<unsigned>(std::countr_zero(ends));
         if (_mm_movemask_epi8(block) == 0) {
             widen(block, out + made);
+            if (ends != 0) return {taken + endsAt, made + endsAt};
             taken += loadedBytes;
             made += loadedBytes;
             continue;
@@ -139,17 +152,31 @@ FILEIO_FOR_SSSE3 Progress decodeWindows(const char* bytes, std::size_t count, ch
         const __m128i lanes = _mm_shuffle_epi8(block, load(&tables.shuffles[window.shuffle]));
         const bool isShort = window.shuffle < shortShuffles;
         if (!(isShort ? storeShort(lanes, out + made) : storeLong(lanes, out + made))) break;
+        if (endsAt < window.bytes) {
+            const int units = std::popcount(begins & ~ends & (ends - 1));
+            return {taken + endsAt, made + static_cast<std::size_t>(units)};
+        }
         taken += window.bytes;
         made += static_cast<std::size_t>(isShort ? shortCharacters : longCharacters);
     }
     return {taken, made};
 }
 
+bool hasInstructions() {
+    return __builtin_cpu_supports("ssse3") && __builtin_cpu_supports("popcnt");
+}
+
 }  // namespace
 
 Progress decodeMixedUtf8(const char* bytes, std::size_t count, char16_t* out, std::size_t room) {
-    if (!__builtin_cpu_supports("ssse3")) return {0, 0};
-    return decodeWindows(bytes, count, out, room);
+    if (!hasInstructions()) return {0, 0};
+    return decodeWindows<false>(bytes, count, out, room);
+}
+
+Progress decodeMixedUtf8Line(const char* bytes, std::size_t count, char16_t* out,
+                             std::size_t room) {
+    if (!hasInstructions()) return {0, 0};
+    return decodeWindows<true>(bytes, count, out, room);
 }
 
 }  // namespace Orvandeil::FileIO::detail
@@ -159,6 +186,9 @@ Progress decodeMixedUtf8(const char* bytes, std::size_t count, char16_t* out, st
 namespace Orvandeil::FileIO::detail {
 
 Progress decodeMixedUtf8(const char*, std::size_t, char16_t*, std::size_t) {
+    return {0, 0};
+}
+Progress decodeMixedUtf8Line(const char*, std::size_t, char16_t*, std::size_t) {
     return {0, 0};
 }
 

@@ -12,8 +12,8 @@ using namespace Orvandeil::FileIO;
 // Every line as its text and its result, then "$" as soon as the end of the file shows.
 std::string linesOf(fileStream& stream, long max) {
     std::string summary;
-    while (true) {
-        OutputBuffer line(vxCHAR_CLASS, 16, 4, 64);
+    for (std::size_t chunk = 4;; chunk = 404 - chunk) {
+        OutputBuffer line(vxCHAR_CLASS, 16, chunk, 64);
         const int result = stream.GetLine(max, line);
         const std::size_t units = line.GetSize();
         if (units == 0) return summary + " code " + std::to_string(stream.getErrorCode());

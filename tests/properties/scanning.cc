@@ -47,7 +47,7 @@ std::string scanText(const std::string& text, const std::string& encoding,
 std::string readOn(fileStream& stream, const std::string& format) {
     std::string seen;
     for (int turn = 0; turn < 6; ++turn) {
-        OutputBuffer line(vxCHAR_CLASS, 16, 16, 64);
+        OutputBuffer line(vxCHAR_CLASS, 16, turn % 3 == 0 ? 16 : 200, 64);
         seen += " line " + std::to_string(stream.GetLine(turn % 2 == 0 ? -1 : 7, line)) + ' ';
         const std::size_t units = line.GetSize();
         const auto text = line.Transfer();
