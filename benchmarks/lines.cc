@@ -23,10 +23,10 @@ std::unique_ptr<embedded::OpenFile> openUtf8(const std::string& path) {
 void linesByOurs(Trial& trial, const std::string& path) {
     trial.time([&] {
         const auto file = openUtf8(path);
-        while (const auto line =
-                   embedded::readLine(*file, embedded::anyLength, embedded::Terminators::Kept)) {
-            keep(line->text.data());
-            trial.result(std::u16string_view(line->text));
+        embedded::Line line;
+        while (embedded::readLine(*file, line, embedded::anyLength, embedded::Terminators::Kept)) {
+            keep(line.text.data());
+            trial.result(std::u16string_view(line.text));
         }
     });
 }

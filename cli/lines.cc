@@ -28,9 +28,10 @@ void show(const embedded::Line& line, embedded::Terminators terminators, Report&
 std::optional<embedded::Failure> showLines(embedded::OpenFile& file, long maxCharacters,
                                            embedded::Terminators terminators, Report& report) {
     try {
-        while (const auto line = embedded::readLine(file, maxCharacters, terminators)) {
-            show(*line, terminators, report);
-            if (line->failure) return line->failure;
+        embedded::Line line;
+        while (embedded::readLine(file, line, maxCharacters, terminators)) {
+            show(line, terminators, report);
+            if (line.failure) return line.failure;
         }
     } catch (const embedded::CodeError& error) {
         return embedded::Failure{error.code, error.what()};

@@ -50,7 +50,7 @@ void requireWritable(const OpenFile& file) {
     throw CodeError(file.failure(code::IsOpenRead));
 }
 
-void beginTransfer(OpenFile& file, Direction direction) {
+void settleTransfer(OpenFile& file, Direction direction) {
     begin(file, direction, 0, file.format.dataSizeType);
 }
 

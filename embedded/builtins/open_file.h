@@ -32,11 +32,16 @@ struct OpenFile {
     // A failure of this file.
     Failure failure(int code) const { return {code, label}; }
 
+    static constexpr std::size_t usualLine = 512;
+    static constexpr std::size_t longestLineChunk = 1 << 20;
+
     const std::string label;  // as messages name the file
     FilePermission permission;
     MachineFormat format;  // of transfers that name none
     FileHandle handle;
     std::unique_ptr<fileStream> stream;
+    // Empty between two lines, and keeps the memory of a short one.
+    OutputBuffer lineUnits{vxCHAR_CLASS, usualLine, usualLine, longestLineChunk};
     Direction direction = Direction::None;  // of the last transfer since a positioning
 };
 
@@ -44,10 +49,15 @@ struct OpenFile {
 void requireReadable(const OpenFile& file);
 void requireWritable(const OpenFile& file);
 
+// The part of beginTransfer for transfers that do not simply go on.
+void settleTransfer(OpenFile& file, Direction direction);
+
 // Every transfer begins with this: it settles the bits of the transfer before, and positions the
 // file between reading and writing, as ISO C demands (7.21.5.3). CodeError -31 when bits cannot be
 // settled, with the cause in its text, -33 when the file cannot be positioned.
-void beginTransfer(OpenFile& file, Direction direction);
+inline void beginTransfer(OpenFile& file, Direction direction) {
+    if (file.direction != direction || file.carry().active) settleTransfer(file, direction);
+}
 // The same for bit fields, which continue in the byte that the transfer before has used in part.
 void beginBitTransfer(OpenFile& file, Direction direction, int dataSizeType);
 

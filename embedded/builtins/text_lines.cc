@@ -4,28 +4,62 @@
 #include "fileio/buffers/output_buffer.h"
 
 namespace Orvandeil::FileIO::embedded {
+namespace {
 
-std::optional<Line> readLine(OpenFile& file, long maxCharacters, Terminators terminators) {
-    constexpr std::size_t usualUnits = 128;
-    constexpr std::size_t mostUnits = 1 << 20;
+// Empties a buffer with its scope. A line that lay in the first chunk leaves its memory to the
+// next; of anything else, failures included, nothing is kept.
+class Emptied {
+public:
+    explicit Emptied(OutputBuffer& filled) : buffer(filled) { buffer.SetRollbackPoint(); }
+    Emptied(const Emptied&) = delete;
+    Emptied& operator=(const Emptied&) = delete;
+    ~Emptied() {
+        if (buffer.GetSize() > OpenFile::usualLine) buffer.SetRollbackPoint();
+        buffer.Rollback();
+    }
+
+private:
+    OutputBuffer& buffer;
+};
+
+// The first chunk has at least the usual size, so that a line of it is in one piece.
+void copyTo(std::u16string& text, OutputBuffer& units, std::size_t count) {
+    if (units.GetSize() <= OpenFile::usualLine) {
+        units.ResetNext();
+        text.assign(static_cast<const char16_t*>(units.GetNext()), count);
+    } else {
+        const detail::HostBytes joined(static_cast<char*>(units.TransferRaw()));
+        text.assign(reinterpret_cast<const char16_t*>(joined.get()), count);
+    }
+}
+
+}  // namespace
+
+bool readLine(OpenFile& file, Line& line, long maxCharacters, Terminators terminators) {
+    line.text.clear();
+    line.failure.reset();
     requireReadable(file);
     beginTransfer(file, Direction::Reading);
-    OutputBuffer units(vxCHAR_CLASS, usualUnits, usualUnits, mostUnits);
+    OutputBuffer& units = file.lineUnits;
+    const Emptied emptied(units);
     const int codeBefore = file.stream->getErrorCode();
-    Line line;
     line.result = file.stream->GetLine(maxCharacters, units);
     const std::size_t count = units.GetSize();
     const int code = file.stream->getErrorCode();
     if (count == 0) {
         if (code != 0) throw CodeError(file.failure(code));
-        return std::nullopt;
+        return false;
     }
     // What could not be decoded is part of the line; the system's errors are not.
     if (code > 0 && code != codeBefore) line.failure = file.failure(code);
-    const detail::HostBytes block(static_cast<char*>(units.TransferRaw()));
     const auto dropped = terminators == Terminators::Dropped ? line.result : 0;
-    line.text.assign(reinterpret_cast<const char16_t*>(block.get()),
-                     count - static_cast<std::size_t>(dropped));
+    copyTo(line.text, units, count - static_cast<std::size_t>(dropped));
+    return true;
+}
+
+std::optional<Line> readLine(OpenFile& file, long maxCharacters, Terminators terminators) {
+    Line line;
+    if (!readLine(file, line, maxCharacters, terminators)) return std::nullopt;
     return line;
 }
 

@@ -23,4 +23,8 @@ inline constexpr long anyLength = -1;
 std::optional<Line> readLine(OpenFile& file, long maxCharacters = anyLength,
                              Terminators terminators = Terminators::Dropped);
 
+// The same into a line that was read before, whose memory serves again; false for nothing, which
+// leaves an empty line.
+bool readLine(OpenFile& file, Line& line, long maxCharacters, Terminators terminators);
+
 }  // namespace Orvandeil::FileIO::embedded
