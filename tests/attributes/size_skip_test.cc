@@ -17,7 +17,6 @@ using embedded::makeDoubles;
 using embedded::makeRow;
 
 constexpr double inf = HUGE_VAL;
-constexpr double limit = 281474976710655;
 
 // The last part of what an attribute raises.
 std::string errorOf(const NumericAttr& attribute) {
