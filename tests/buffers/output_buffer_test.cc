@@ -64,11 +64,11 @@ private:
     void fill() {
         const std::size_t asked = upTo(12), used = upTo(asked);
         std::size_t n = asked;
-        auto* room = static_cast<char*>(buffer.Allocate(n));
+        auto* room = static_cast<std::uint16_t*>(buffer.Allocate(n));
         ASSERT_EQ(n, asked);
         Units units(asked);
         std::generate(units.begin(), units.end(), std::ref(random));
-        std::memcpy(room, units.data(), 2 * asked);
+        std::ranges::copy(units, room);
         model.insert(model.end(), units.begin(), units.begin() + static_cast<std::ptrdiff_t>(used));
         buffer.SetLastChunkSize(used);
     }
