@@ -124,9 +124,14 @@ std::vector<std::uint64_t> anyValues(Bytes& input) {
 // on in the same direction and order begin at the next whole byte.
 void bitFields(Bytes& input) {
     constexpr std::size_t mostOfOneStep = 1200;
-    BitFile model{std::vector<bool>(8 * (mostOfOneStep + input.below(1500)))};
-    for (std::size_t i = 0; i < model.bits.size(); ++i)
-        model.bits[i] = i * i % 7 % 2;
+    static const std::vector<bool> pattern = [] {
+        std::vector<bool> bits;
+        for (std::size_t i = 0; i < 8 * (mostOfOneStep + 1500); ++i)
+            bits.push_back(i * i % 7 % 2 != 0);
+        return bits;
+    }();
+    BitFile model{pattern};
+    model.bits.resize(8 * (mostOfOneStep + input.below(1500)));
     const support::MemoryFile content(model.bytes());
     auto file = openFile(content.path(), {"r+", "n", ""});
     bool isWrite = false;

@@ -28,7 +28,8 @@ std::string modelOf(std::u16string_view text, long max) {
     std::string summary;
     while (!text.empty() && (max > 0 || max == -1)) {
         const auto limit = static_cast<std::size_t>(max);
-        const std::size_t body = std::min({text.find_first_of(u"\r\n"), text.size(), limit});
+        const std::u16string_view most = text.substr(0, limit);
+        const std::size_t body = std::min(most.find_first_of(u"\r\n"), most.size());
         const bool isPair = body + 1 < limit && text.substr(body, 2) == u"\r\n";
         const std::size_t result = isPair ? 2 : body < std::min(limit, text.size()) ? 1 : 0;
         const std::size_t length = body + result;
