@@ -1,5 +1,6 @@
 #include "cli/json_writer.h"
 
+#include "cli/utf8_slices.h"
 #include "embedded/services/array.h"
 #include "embedded/services/element_types.h"
 #include "fileio/host/dispatch.h"
@@ -22,6 +23,60 @@ void* JsonMemory::Realloc(void* block, std::size_t, std::size_t bytes) {
     return resized;
 }
 
+void JsonBlock::passOn() {
+    sink({text, used});
+    used = 0;
+    isPassedOn = true;
+}
+
+bool JsonBlock::takeBack() {
+    if (isPassedOn) return false;
+    used = 0;
+    return true;
+}
+
+void JsonWriter::Writer::putEscaped(char c) {
+    constexpr std::string_view named = "\"\\\b\f\n\r\t", names = "\"\\bfnrt";
+    constexpr std::string_view digits = "0123456789ABCDEF";
+    const std::size_t at = named.find(c);
+    const auto code = static_cast<unsigned char>(c);
+    os_->Put('\\');
+    if (at != named.npos) return os_->Put(names[at]);
+    for (const char letter : {'u', '0', '0', digits[code / 16u], digits[code % 16u]})
+        os_->Put(letter);
+}
+
+// Of any length, without a copy of all of it.
+void JsonWriter::Writer::longString(std::u16string_view text) {
+    Prefix(rapidjson::kStringType);
+    os_->Put('"');
+    const auto put = [this](std::string_view slice) {
+        for (const char c : slice) {
+            const bool isPlain = static_cast<unsigned char>(c) >= ' ' && c != '"' && c != '\\';
+            isPlain ? os_->Put(c) : putEscaped(c);
+        }
+    };
+    try {
+        forEachUtf8Slice(text, put);
+    } catch (...) {
+        // The object stays one, with the text cut short.
+        os_->Put('"');
+        throw;
+    }
+    os_->Put('"');
+}
+
+void JsonWriter::Writer::endParts() {
+    for (;;) {
+        const auto* const level = level_stack_.Top<Level>();
+        const bool isInside = level_stack_.GetSize() > sizeof(Level);
+        const bool isList = level->inArray;
+        if (!isList && level->valueCount % 2 != 0) Null();
+        if (!isInside) return;
+        isList ? EndArray() : EndObject();
+    }
+}
+
 JsonWriter& JsonWriter::key(std::string_view name) {
     writer.Key(name.data(), static_cast<rapidjson::SizeType>(name.size()));
     return *this;
@@ -32,8 +87,7 @@ void JsonWriter::value(std::string_view text) {
 }
 
 void JsonWriter::value(std::u16string_view text) {
-    const std::string utf8 = vxTextToNarrow(text.data(), text.size());
-    writer.String(utf8.data(), static_cast<rapidjson::SizeType>(utf8.size()));
+    writer.longString(text);
 }
 
 void JsonWriter::numberText(const NumberText& number) {
@@ -80,15 +134,15 @@ void JsonWriter::stringData(const vxArray& array) {
 }
 
 void JsonWriter::restart() {
-    buffer.Clear();
-    writer.Reset(buffer);
+    if (!block.takeBack()) return writer.endParts();
+    writer.Reset(block);
     writer.StartObject();
 }
 
-std::string_view JsonWriter::finish() {
+void JsonWriter::finish() {
     writer.EndObject();
-    buffer.Put('\n');
-    return {buffer.GetString(), buffer.GetSize()};
+    block.Put('\n');
+    block.passOn();
 }
 
 }  // namespace cli

@@ -6,10 +6,11 @@
 #include <concepts>
 #include <cstddef>
 #include <cstdlib>
+#include <functional>
 #include <string>
 #include <string_view>
+#include <utility>
 
-#include <rapidjson/stringbuffer.h>
 #include <rapidjson/writer.h>
 
 namespace cli {
@@ -22,10 +23,35 @@ struct JsonMemory {
     static void Free(void* block) { std::free(block); }
 };
 
-// One JSON object, written key by key into memory. It is open from the beginning.
+// What the writer writes into: a block that is passed on whenever it is full.
+class JsonBlock {
+public:
+    using Ch = char;
+    using Sink = std::function<void(std::string_view)>;
+
+    explicit JsonBlock(Sink receiver) : sink(std::move(receiver)) {}
+
+    void Put(char c) {
+        if (used == sizeof text) passOn();
+        text[used++] = c;
+    }
+    void Flush() {}
+
+    void passOn();
+    // Forgets the text unless a part of it is gone already; whether it did.
+    bool takeBack();
+
+private:
+    Sink sink;
+    std::size_t used = 0;
+    bool isPassedOn = false;
+    char text[65536];
+};
+
+// One JSON object, written key by key into a sink. It is open from the beginning.
 class JsonWriter {
 public:
-    JsonWriter() { writer.StartObject(); }
+    explicit JsonWriter(JsonBlock::Sink sink) : block(std::move(sink)) { writer.StartObject(); }
     JsonWriter(const JsonWriter&) = delete;
     JsonWriter& operator=(const JsonWriter&) = delete;
 
@@ -55,11 +81,12 @@ public:
     // of a string array are texts, missing ones null.
     void arrayKeys(const vxArray& array);
 
-    // Starts the object anew, without a key.
+    // Starts the object anew, without a key. When a part of it is gone, ends what was begun within
+    // it instead, a key without a value by null.
     void restart();
 
-    // Closes the object and gives its text, one line with its end.
-    std::string_view finish();
+    // Closes the object, one line with its end.
+    void finish();
 
 private:
     void numberText(const NumberText& number);
@@ -67,9 +94,14 @@ private:
     void stringData(const vxArray& array);
 
     using Encoding = rapidjson::UTF8<>;
-    using Buffer = rapidjson::GenericStringBuffer<Encoding, JsonMemory>;
-    Buffer buffer;
-    rapidjson::Writer<Buffer, Encoding, Encoding, JsonMemory> writer{buffer};
+    struct Writer : rapidjson::Writer<JsonBlock, Encoding, Encoding, JsonMemory> {
+        using rapidjson::Writer<JsonBlock, Encoding, Encoding, JsonMemory>::Writer;
+        void putEscaped(char c);
+        void longString(std::u16string_view text);
+        void endParts();
+    };
+    JsonBlock block;
+    Writer writer{block};
 };
 
 }  // namespace cli

@@ -1,10 +1,10 @@
 #include "cli/files.h"
+#include "cli/utf8_slices.h"
 #include "cli/verb.h"
 #include "embedded/builtins/text_lines.h"
 #include "fileio/host/exception.h"
-#include "fileio/host/text.h"
 
-#include <string>
+#include <string_view>
 
 namespace cli {
 
@@ -20,8 +20,8 @@ void show(const embedded::Line& line, embedded::Terminators terminators, Report&
         report.object().endObject();
         return;
     }
-    const std::string text = vxTextToNarrow(line.text.data(), line.text.size());
-    report.print(terminators == embedded::Terminators::Kept ? text : text + '\n');
+    forEachUtf8Slice(line.text, [&](std::string_view slice) { report.print(slice); });
+    if (terminators == embedded::Terminators::Dropped) report.print("\n");
 }
 
 // What was read before a failure is shown.

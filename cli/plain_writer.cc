@@ -1,16 +1,14 @@
 #include "cli/plain_writer.h"
 
 #include "cli/number_text.h"
+#include "cli/utf8_slices.h"
 #include "embedded/services/array.h"
 #include "embedded/services/element_types.h"
 #include "fileio/host/dispatch.h"
-#include "fileio/host/text.h"
 
 #include <span>
 #include <string>
 #include <string_view>
-
-#include <unicode/utf16.h>
 
 namespace cli {
 
@@ -59,15 +57,9 @@ void printNumbers(std::span<const T> elements, std::size_t rows, Report& report)
     block.flush();
 }
 
-// In slices, which end behind no first half of a pair.
 void printText(std::u16string_view text, Report& report) {
-    constexpr std::size_t sliceUnits = 1 << 16;
-    while (text.size() > sliceUnits) {
-        const std::size_t units = sliceUnits - (U16_IS_LEAD(text[sliceUnits - 1]) ? 1 : 0);
-        report.print(vxTextToNarrow(text.data(), units));
-        text.remove_prefix(units);
-    }
-    report.print(vxTextToNarrow(text.data(), text.size()) + '\n');
+    forEachUtf8Slice(text, [&](std::string_view slice) { report.print(slice); });
+    report.print("\n");
 }
 
 void printChars(std::span<const char16_t> units, std::size_t rows, Report& report) {

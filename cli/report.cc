@@ -12,7 +12,7 @@ namespace cli {
 using foundation::core::except::IMsgIDException;
 namespace embedded = Orvandeil::FileIO::embedded;
 
-Report::Report(bool asJson) {
+Report::Report(bool asJson) : json([this](std::string_view text) { print(text); }) {
     if (asJson) recorder.emplace();
 }
 
@@ -70,7 +70,7 @@ int Report::finish() {
         for (const std::string& name : recorder->identifiers())
             json.value(name);
         json.endList();
-        print(json.finish());
+        json.finish();
     }
     flush();
     // What failed first has been told; often it was this output.

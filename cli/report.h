@@ -15,8 +15,8 @@ inline constexpr int exitFailed = 1;
 inline constexpr int exitUsage = 2;
 
 // Everything a verb tells: its output, its error and the exit code. In plain mode output goes out
-// as it comes and warnings are printed at once. In JSON mode both are kept for the one object that
-// finish() prints; an error is one line on standard error in either mode.
+// as it comes and warnings are printed at once. In JSON mode both go into the one object that
+// finish() ends; an error is one line on standard error in either mode.
 class Report {
 public:
     explicit Report(bool json);
@@ -37,7 +37,8 @@ public:
     void fail(int code, std::string_view place = {});
     // The call failed with an identifier that has no code.
     void fail(const foundation::core::except::IMsgIDException& error, std::string_view place = {});
-    // The call ended for want of memory, perhaps within a key: the verb's keys are given up.
+    // The call ended for want of memory, perhaps within a key: the verb's keys are given up, unless
+    // a part of them has been printed.
     void failExhausted();
     // A code that ended the call without being an error.
     void note(int code);

@@ -76,8 +76,11 @@ TEST(MemoryBounds, ResultAndLittleMore) {
         {__LINE__, "scan %d", {"12345\n", 3 * mebi * mebi}, 24 * mebi, 16 * mebi},
         {__LINE__, "scan %f", {"1.25 ", 3 * mebi * mebi}, 24 * mebi, 16 * mebi},
         {__LINE__, "scan %s", {"y", 12 * mebi * mebi}, 24 * mebi, 16 * mebi},
+        {__LINE__, "scan --json %d", {"12345\n", 3 * mebi * mebi}, 24 * mebi, 16 * mebi},
+        {__LINE__, "scan --json %s", {"y", 12 * mebi * mebi}, 24 * mebi, 16 * mebi},
 #endif
         {__LINE__, "lines", {line, 300000}, 0, 16 * mebi},
+        {__LINE__, "lines --json", {line, 300000}, 0, 16 * mebi},
         {__LINE__, "read --precision double --npy /dev/null", {line, 600000}, 47 * mebi, 4 * mebi},
 #ifdef FILEIO_FAST_PATHS  // without them, the elements of the file lie beside the array
         {__LINE__,
