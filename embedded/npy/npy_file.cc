@@ -12,6 +12,7 @@
 #include <cstdio>
 #include <cstring>
 #include <memory>
+#include <utility>
 #include <vector>
 
 #include <sys/stat.h>
@@ -181,28 +182,38 @@ auto placeOfSize(std::size_t size) {
     }
 }
 
-Dimensions arrayDimensions(const NpyHeader& header) {
-    Dimensions dimensions = header.shape;
-    dimensions.resize(std::max<std::size_t>(dimensions.size(), 2), 1);
-    return dimensions;
+// Whether the bytes in the file are those of the array.
+bool liesAsInArray(const NpyHeader& header) {
+    return header.type->complexity == vxREAL && fileAxes(header).size() <= 1;
 }
 
-ArrayPtr arrayOf(const NpyHeader& header, const std::byte* data) {
+ArrayPtr placed(const NpyHeader& header, const std::byte* data) {
     const NpyType& type = *header.type;
-    ArrayPtr array = makeNumeric(type.classID, arrayDimensions(header), type.complexity);
+    ArrayPtr array = makeNumeric(type.classID, header.shape, type.complexity);
     const std::size_t count = npyElementCount(header.shape);
     if (count == 0) return array;
     const std::size_t size = elementBytes(type.classID);
     const std::size_t step = npyElementBytes(type);
     const auto placeAll = placeOfSize(size);
-    auto* real = static_cast<std::byte*>(realData(*array));
-    placeAll(data, step, real, count, fileAxes(header));
+    placeAll(data, step, static_cast<std::byte*>(realData(*array)), count, fileAxes(header));
     if (type.complexity == vxCOMPLEX) {
         auto* imaginary = static_cast<std::byte*>(imaginaryData(*array));
         placeAll(data + size, step, imaginary, count, fileAxes(header));
     }
-    if (type.classID == vxLOGICAL_CLASS) {
-        std::transform(real, real + count, real,
+    return array;
+}
+
+ArrayPtr arrayOf(const NpyHeader& header, Block data) {
+    ArrayPtr array;
+    if (liesAsInArray(header)) {
+        array = makeNumeric(header.type->classID, header.shape, data.get());
+        static_cast<void>(data.release());
+    } else {
+        array = placed(header, data.get());
+    }
+    if (header.type->classID == vxLOGICAL_CLASS) {
+        auto* const values = static_cast<std::byte*>(realData(*array));
+        std::transform(values, values + elementCount(*array), values,
                        [](std::byte value) { return std::byte{value != std::byte{0}}; });
     }
     return array;
@@ -267,11 +278,11 @@ ArrayPtr npyRead(const std::string& file) {
     NpyInput input(file);
     const NpyHeader header = input.readHeader();
     const std::size_t bytes = npyElementCount(header.shape) * npyElementBytes(*header.type);
-    const Block data = input.readData(bytes);
+    Block data = input.readData(bytes);
     const bool isNative = header.isBigEndian == (std::endian::native == std::endian::big);
     const std::size_t size = elementBytes(header.type->classID);
     if (!isNative) swapBytes(data.get(), bytes / size, size);
-    return arrayOf(header, data.get());
+    return arrayOf(header, std::move(data));
 }
 
 void npyWrite(const std::string& file, const vxArray& array) {

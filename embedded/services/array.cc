@@ -76,6 +76,12 @@ ArrayPtr makeNumeric(vxClassID classID, Dimensions dimensions, vxComplexity comp
     return ArrayPtr(array.release());
 }
 
+ArrayPtr makeNumeric(vxClassID classID, Dimensions dimensions, void* block) {
+    auto array = makeBare(classID, nameOfClass(classID), atLeastTwo(std::move(dimensions)));
+    array->real.reset(block);
+    return ArrayPtr(array.release());
+}
+
 ArrayPtr makeDoubles(std::size_t rows, std::size_t columns, std::span<const double> values) {
     ArrayPtr array = makeNumeric(vxDOUBLE_CLASS, {rows, columns});
     std::copy_n(values.begin(), std::min(values.size(), elementCount(*array)),

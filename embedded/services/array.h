@@ -34,6 +34,9 @@ using FunctionTable = std::map<std::string, HostFunction, std::less<>>;
 // Lengths of any number; padded with 1 to two dimensions. Elements are zero.
 FILEIO_API ArrayPtr makeNumeric(vxClassID classID, Dimensions dimensions,
                                 vxComplexity complexity = vxREAL);
+// The same, of real elements that lie in a block of the host's memory, which the array takes over
+// unless this raises.
+FILEIO_API ArrayPtr makeNumeric(vxClassID classID, Dimensions dimensions, void* block);
 // `values` in column-major order, rows × columns of them.
 FILEIO_API ArrayPtr makeDoubles(std::size_t rows, std::size_t columns,
                                 std::initializer_list<double> values);
