@@ -42,54 +42,12 @@ bool strikes(Call call) {
     return true;
 }
 
-// What is left of a transfer: 0 when it fails, less than all when it is cut short.
-std::size_t allowed(Call call, std::size_t size) {
-    if (!strikes(call)) return size;
-    return state.fault->error != 0 ? 0 : std::min<std::size_t>(size, 1);
-}
-
-Disk& diskOf(void* cookie) {
-    return *static_cast<Disk*>(cookie);
-}
-
-ssize_t readBytes(void* cookie, char* buffer, std::size_t size) {
-    Disk& disk = diskOf(cookie);
-    const std::size_t count = allowed(Call::Read, size);
-    if (count == 0 && size != 0) return -1;
-    const std::size_t start = std::min(disk.offset, disk.bytes.size());
-    disk.offset = start + disk.bytes.copy(buffer, count, start);
-    return static_cast<ssize_t>(disk.offset - start);
-}
-
-ssize_t writeBytes(void* cookie, const char* buffer, std::size_t size) {
-    Disk& disk = diskOf(cookie);
-    const std::size_t count = allowed(Call::Write, size);
-    if (disk.appends) disk.offset = disk.bytes.size();
-    disk.bytes.resize(std::max(disk.bytes.size(), disk.offset + count));
-    disk.bytes.replace(disk.offset, count, buffer, count);
-    disk.offset += count;
-    return static_cast<ssize_t>(count);
-}
-
-int seekTo(void* cookie, off64_t* offset, int whence) {
-    Disk& disk = diskOf(cookie);
-    if (strikes(Call::Seek)) return -1;
-    if (!disk.seekable) {
-        errno = ESPIPE;
-        return -1;
-    }
-    const std::size_t origins[] = {0, disk.offset, disk.bytes.size()};
-    *offset += static_cast<off64_t>(origins[whence]);
-    if (*offset < 0) {
-        errno = EINVAL;
-        return -1;
-    }
-    disk.offset = static_cast<std::size_t>(*offset);
-    return 0;
-}
-
-int closeDisk(void*) {
-    return strikes(Call::Close) ? -1 : 0;
+std::size_t allowed(const support::FaultyFile& file, Call call, std::size_t count) {
+    const bool isStruck = strikes(call);
+    const bool isPipe = call == Call::Seek && !static_cast<const Disk&>(file).seekable;
+    if (isPipe && !isStruck) errno = ESPIPE;
+    if (!isStruck) return isPipe ? 0 : count;
+    return state.fault->error != 0 ? 0 : std::min<std::size_t>(count, 1);
 }
 
 void* allocate(std::size_t bytes) noexcept {
@@ -130,8 +88,10 @@ std::size_t liveObjectCount() {
     return state.liveObjects;
 }
 
-Disk::Disk(std::string_view content) : bytes(content) {
+Disk::Disk(std::string_view content) {
+    bytes = content;
     bytes.reserve(largestDisk);
+    allow = allowed;
     state.newestDisk = this;
 }
 
@@ -141,19 +101,10 @@ Disk::~Disk() {
 
 // A buffer of a few bytes, so that there are many calls.
 std::FILE* Disk::open(const char* mode) {
+    const Pause pause;
     appends = mode[0] == 'a';
     if (mode[0] == 'w') bytes.clear();
-    std::FILE* const file = fopencookie(this, mode, {readBytes, writeBytes, seekTo, closeDisk});
-    std::setvbuf(file, buffer, _IOFBF, sizeof buffer);
-    return file;
-}
-
-bool Disk::write(std::string_view text) {
-    return writeBytes(this, text.data(), text.size()) == static_cast<ssize_t>(text.size());
-}
-
-bool Disk::flush() {
-    return true;
+    return FaultyFile::open(mode, 16);
 }
 
 }  // namespace faults

@@ -10,7 +10,7 @@
 // program that includes this replaces the global operator new, and fstat.
 namespace faults {
 
-enum class Call { HostMemory, Memory, Read, Write, Seek, Stat, Close };
+using support::Call;
 
 struct Fault {
     Call call;
@@ -44,19 +44,15 @@ std::size_t liveObjectCount();
 
 // A file in memory and a place for a console's text, subject to injections. Where fstat is asked
 // about a file without a descriptor, it tells the size of the newest one.
-struct Disk : Orvandeil::FileIO::embedded::ConsoleTarget {
+struct Disk : support::FaultyFile, Orvandeil::FileIO::embedded::ConsoleTarget {
     explicit Disk(std::string_view content);
     ~Disk() override;
 
     std::FILE* open(const char* mode);
-    bool write(std::string_view text) override;
-    bool flush() override;
+    bool write(std::string_view text) override { return put(text) == text.size(); }
+    bool flush() override { return true; }
 
-    std::string bytes;
-    std::size_t offset = 0;
-    bool appends = false;
     bool seekable = true;
-    char buffer[16];
 };
 
 }  // namespace faults

@@ -1,5 +1,7 @@
 #include "fileio/printf/printf_controller.h"
 
+#include "embedded/services/array.h"
+#include "fileio/printf/printf_argument_source.h"
 #include "fileio/text/output_string_stream.h"
 #include "tests/support/printing.h"
 
@@ -7,12 +9,12 @@
 
 #include <gtest/gtest.h>
 
+namespace {
+
 using namespace Orvandeil::FileIO;
 using namespace Orvandeil::FileIO::embedded;
 using fileio_tests::print;
 using foundation::core::except::IMsgIDException;
-
-namespace {
 
 const double nan = std::numeric_limits<double>::quiet_NaN();
 
@@ -138,6 +140,39 @@ TEST(PrintfController, StopsAtTheFirstShortWrite) {
     EXPECT_FALSE(controller.doPrintf());
     EXPECT_EQ(controller.getErrorCode(), 0);  // a text in memory has no cause to tell
     EXPECT_EQ(out.calls, "put 1; print 1; put 1; put 2; print 2; ");
+}
+
+std::vector<double> walkRow(printfMatrixArgumentSource& source) {
+    std::vector<double> row;
+    while (source.hasMoreData())
+        row.push_back(source.getCurrentArgumentAs<double>());
+    return row;
+}
+
+// No driver of the library walks rows; hosts that do rely on this.
+TEST(PrintfMatrixArgumentSource, WalksRows) {
+    const ArrayPtr matrix = makeDoubles(2, 3, {0, 1, 2, 3, 4, 5});
+    const vxArray* argument[] = {matrix.get()};
+    printfMatrixArgumentSource source(argument);
+    EXPECT_EQ(walkRow(source), (std::vector<double>{0, 2, 4}));
+    EXPECT_FALSE(source.hasCurrentArg());
+    source.setRow(1);
+    EXPECT_EQ(source.remainingArgumentLength(), 3u);
+    EXPECT_EQ(walkRow(source), (std::vector<double>{1, 3, 5}));
+    source.resetRow();
+    EXPECT_EQ(source.getCurrentArgumentAs<double>(), 1);
+    source.resetRow();  // only a row walked to its end starts again
+    EXPECT_EQ(source.remainingArgumentLength(), 3u);
+    EXPECT_EQ(source.getCurrentArgumentAs<double>(), 3);
+}
+
+TEST(PrintfMatrixArgumentSource, CountsFurtherDimensionsAsColumns) {
+    const ArrayPtr cube = makeNumeric(vxCHAR_CLASS, {2, 2, 2});
+    const vxArray* argument[] = {cube.get()};
+    printfMatrixArgumentSource source(argument);
+    EXPECT_FALSE(source.canUsePercentSOptimization());
+    source.setRow(1);
+    EXPECT_EQ(walkRow(source).size(), 4u);
 }
 
 }  // namespace

@@ -1,6 +1,7 @@
 #include "tests/support/scanning.h"
 
 #include "fileio/text/input_string_stream.h"
+#include "tests/oracle/scan_oracle.h"
 #include "tests/properties/properties.h"
 #include "tests/support/printing.h"
 #include "tests/support/test_files.h"
@@ -8,11 +9,13 @@
 
 #include <cerrno>
 #include <cstdio>
+#include <cstring>
 
 namespace properties {
 namespace {
 
 using namespace Orvandeil::FileIO;
+using namespace std::string_literals;
 using support::Scanned;
 
 struct UnknownStringStream : inputStringStream {
@@ -24,23 +27,36 @@ struct UnknownFileStream : fileStream {
 
 constexpr const char* encodings[] = {"UTF-8", "", "ISO-8859-1", "UTF-16LE", "Shift_JIS", "UTF-8"};
 
+// How a text is scanned: what is read ahead of a file, whether it can seek, whether lines and more
+// scans follow, the bytes to step back over then, and the least chunk of the result.
+struct Way {
+    long limit = -1;
+    std::size_t readAhead = 1;
+    bool canSeek = true, readsOn = false;
+    unsigned long back = 0;
+    std::size_t chunk = 4;
+};
+
 // What shows of a scan, then what is left of the input.
-template <class Stream>
-std::string finish(Stream& stream, const Scanned& scanned) {
+std::string finish(TcodnStream& stream, const Scanned& scanned, const Way& way) {
+    std::string seen = scanned.summary();
+    for (const long number : {long{scanned.result}, static_cast<long>(scanned.conversions),
+                              static_cast<long>(scanned.nextIndex), long{scanned.isRecycled},
+                              long{stream.getErrorCode()}, long{stream.EndOfData()},
+                              long{way.back == 0 || stream.Rewind(way.back)}})
+        seen += ' ' + std::to_string(number);
     std::u16string rest;
     stream.GetNCodePoints(rest, 1000, nullptr);
-    return scanned.summary() + " result " + std::to_string(scanned.result) + " error " +
-           std::to_string(stream.getErrorCode()) + " end " + std::to_string(stream.EndOfData()) +
-           " rest " + bytesOf(rest);
+    return seen + " rest " + bytesOf(rest);
 }
 
 template <class Stream>
 std::string scanText(const std::string& text, const std::string& encoding,
-                     const std::string& format, long limit) {
+                     const std::string& format, const Way& way) {
     Stream stream(text.c_str(), std::ssize(text), encoding);
-    const Scanned scanned = support::scan(stream, format, limit);
+    const Scanned scanned = support::scan(stream, format, way.limit, way.chunk);
     if (scanned.position > std::ssize(text)) throw Broken("read beyond the end: " + text);
-    return finish(stream, scanned);
+    return finish(stream, scanned, way);
 }
 
 // Lines and scans in turn.
@@ -60,20 +76,31 @@ std::string readOn(fileStream& stream, const std::string& format) {
 
 template <class Stream>
 std::string scanFile(const std::string& text, const std::string& encoding,
-                     const std::string& format, long limit, std::size_t bufferSize,
-                     bool canSeek = true, bool readsOn = false) {
-    support::FaultyFile memory{.bytes = text, .failingSeek = canSeek ? 0 : 1, .error = ESPIPE};
-    std::FILE* const file = memory.open("r", bufferSize);
+                     const std::string& format, const Way& way) {
+    support::FaultyFile memory{.bytes = text, .failingSeek = way.canSeek ? 0 : 1, .error = ESPIPE};
+    std::FILE* const file = memory.open("r", way.readAhead);
     FilePermission permission;
     std::string seen;
     {
         Stream stream(file, encoding.empty() ? "UTF-8" : encoding, permission, u"");
-        const Scanned scanned = support::scan(stream, format, limit);
-        if (readsOn) seen = readOn(stream, format);
-        seen += finish(stream, scanned);
+        const Scanned scanned = support::scan(stream, format, way.limit, way.chunk);
+        if (way.readsOn) seen = readOn(stream, format);
+        seen += finish(stream, scanned, way);
     }
     std::fclose(file);
     return seen;
+}
+
+// By streams that the library knows, which must do what the same streams do that it does not know.
+std::string scanBoth(const std::string& text, const std::string& encoding,
+                     const std::string& format, const Way& way) {
+    const std::string where = format + " over " + text + " in " + encoding;
+    const std::string seen = scanText<inputStringStream>(text, encoding, format, way);
+    requireEqual(seen, scanText<UnknownStringStream>(text, encoding, format, way), where);
+    const std::string inFile = scanFile<fileStream>(text, encoding, format, way);
+    requireEqual(inFile, scanFile<UnknownFileStream>(text, encoding, format, way),
+                 where + " in a file");
+    return seen + inFile;
 }
 
 // A field that files and texts read alike, behind the conversion for it.
@@ -103,6 +130,64 @@ Field anyField(Bytes& input) {
     return {conversion, text};
 }
 
+const std::string programs[] = {"%d",          "%d,%d",      "%hd %hu,%u",    "%ld",
+                                "%lu",         "%lu%ld",     "%f;%hf\n",      "a %d , b%fc",
+                                "%d%%%f",      "%d%*f",      "%*d %u",        "%f%*[,;]",
+                                "%3d%f",       "%d%s",       "%i %d ",        "x%*f y%*dz%d",
+                                "%hf\t%ld",    "%d\u00E9%f", "%f\u2003%d",    "%f ",
+                                "%s",          "%3s%d",      "%s%2c",         "%[^,],",
+                                "%4[^,\n]%*c", "%c",         "%*s %3c",       "%*[^ ]%u",
+                                "%[0-9]%s",    "%5s,%hf",    "%*[^a]%[]a-f]", "%[acegikmo4]%c",
+                                "%[^\u00E9-a]"};
+
+// Text that a format reads well, with a fault now and then.
+class Inputs : public oracle::Fields {
+public:
+    explicit Inputs(Bytes& bytes) : Fields(bytes), input(bytes) {}
+
+    std::size_t below(std::size_t bound) { return input.below(bound); }
+    std::string text(const std::string& format, std::size_t rounds) {
+        std::string result;
+        const std::size_t faults = 20 + below(200);
+        for (; rounds != 0; --rounds) {
+            for (std::size_t i = 0; i < format.size(); ++i) {
+                if (below(faults) + 1 == faults) result += below(2) == 0 ? "\0"s : Fields::text(1);
+                if ((format[i] == '%' || format[i] == ' ') && below(4) == 0)
+                    result += " \n\t\v"[below(4)];
+                if (format[i] == '%' && format[++i] != '%') {
+                    i = format.find_first_of("dufisc[", i);
+                    result += std::strchr("sc[", format[i]) == nullptr ? number() : word();
+                    if (format[i] == '[') i = format.find(']', i + 3);
+                } else {
+                    result += format[i];
+                }
+            }
+        }
+        return result;
+    }
+
+private:
+    // Mostly longer than what is looked at in one go, or mostly shorter.
+    std::string word() {
+        std::string result;
+        const std::size_t others = below(3) == 0 ? 6 : 30;
+        for (std::size_t n = 1 + below(below(5) == 0 ? 40 : 9); n != 0; --n)
+            result += below(others) != 0 ? "abegmsxy0249"[below(12)] : ",. -]\n\xC3\xA9"[below(8)];
+        return result;
+    }
+    std::string number() {
+        std::string result = std::to_string(1 + below(9));
+        for (std::size_t n = below(below(6) == 0 ? 30 : 9); n != 0; --n)
+            result += static_cast<char>('0' + below(10));
+        if (below(3) == 0) result.insert(below(result.size() + 1), ".");
+        if (below(12) == 0) result += "e" + std::to_string(static_cast<long>(below(700)) - 350);
+        if (below(3) == 0) result.insert(0, below(3) == 0 ? "+" : "-");
+        return result + " "s.substr(below(2));
+    }
+
+    Bytes& input;
+};
+
 }  // namespace
 
 // Any format over any text, through a stream that the library knows and one that it does not.
@@ -117,13 +202,8 @@ void scanning(Bytes& input) {
     const std::string format = input.text(formats, 8), encoding = input.of(encodings);
     const long limit = input.below(3) == 0 ? static_cast<long>(input.below(9)) : -1;
     const std::size_t bufferSize = 1 + input.below(20);
-    const std::string text = input.text(texts, 60), where = format + " over " + text;
-    const std::string seen = scanText<inputStringStream>(text, encoding, format, limit);
-    requireEqual(seen, scanText<UnknownStringStream>(text, encoding, format, limit), where);
-    const std::string inFile = scanFile<fileStream>(text, encoding, format, limit, bufferSize);
-    requireEqual(inFile, scanFile<UnknownFileStream>(text, encoding, format, limit, bufferSize),
-                 where + " in a file");
-    input.observe(seen + inFile);
+    const std::string text = input.text(texts, 60);
+    input.observe(scanBoth(text, encoding, format, {limit, bufferSize}));
     if (input.empty()) return;
     // The same text in any encoding, by scans and lines in turn, from what may be a pipe.
     const std::string name = input.of(statelessEncodings);
@@ -134,9 +214,21 @@ void scanning(Bytes& input) {
     std::string bytes = encoder.output;
     for (std::size_t faults = input.below(3); faults > 0 && !bytes.empty(); --faults)
         bytes[input.below(256) % bytes.size()] = "\xC3\xFF\x81\0,"[input.below(5)];
-    requireEqual(scanFile<fileStream>(bytes, name, format, limit, readAhead, canSeek, true),
-                 scanFile<UnknownFileStream>(bytes, name, format, limit, readAhead, canSeek, true),
-                 where + " in turn with lines, in " + name);
+    scanBoth(bytes, name, format, {limit, readAhead, canSeek, true});
+}
+
+// Any format over a text that it mostly reads, and a step back.
+void scanPrograms(Bytes& input) {
+    static const std::string names[] = {"", "UTF-8", "ISO-8859-1", "Shift_JIS", "UTF-16LE"};
+    Inputs inputs(input);
+    const std::string &format = input.of(programs), &encoding = input.of(names);
+    Way way;
+    way.limit = input.below(3) == 0 ? -1 : static_cast<long>(input.below(20));
+    way.canSeek = input.below(2) == 0;
+    way.readAhead = 1 + input.below(input.below(2) == 0 ? 60 : 200);
+    way.back = 1 + input.below(3);
+    way.chunk = input.below(2) == 0 ? 4 : 64;
+    input.observe(scanBoth(inputs.text(format, input.below(40)), encoding, format, way));
 }
 
 // Formats with texts made for them: a file gives what a text gives, and every field is stored.
@@ -153,8 +245,9 @@ void fileScanning(Bytes& input) {
     }
     const std::size_t bufferSize = 1 + input.below(50);
     const std::string whole = format + " over " + text;
-    const std::string seen = scanText<inputStringStream>(text, "UTF-8", format, -1);
-    requireEqual(scanFile<fileStream>(text, "UTF-8", format, -1, bufferSize), seen, whole);
+    const Way way = {.readAhead = bufferSize};
+    const std::string seen = scanText<inputStringStream>(text, "UTF-8", format, way);
+    requireEqual(scanFile<fileStream>(text, "UTF-8", format, way), seen, whole);
     const std::string count = " #" + std::to_string(stored) + ' ';
     if ((' ' + seen).find(count) == seen.npos) throw Broken(whole + "\n  gives  " + seen);
     input.observe(seen);

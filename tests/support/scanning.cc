@@ -17,16 +17,19 @@ std::string Scanned::summary() const {
     return text;
 }
 
-Scanned scan(TcodnStream& stream, std::string_view format, long limit) {
+Scanned scan(TcodnStream& stream, std::string_view format, long limit, std::size_t chunk) {
     const std::u16string text = fileio_tests::toUtf16(format);
     finFormatParser parser(text.c_str(), &stream);
     parser.InitFormatPieces();
-    OutputBuffer buffer(parser.getResultClass(), 4, 4, 64);
+    OutputBuffer buffer(parser.getResultClass(), chunk, chunk, 64);
     Scanned scanned;
     scanControl control(limit < 0 ? 0 : static_cast<unsigned long>(limit), limit < 0, scanned.count,
                         stream, parser, buffer);
     scanned.result = control.performMainScan();
     scanned.code = control.getError();
+    scanned.conversions = control.getConversions();
+    scanned.nextIndex = parser.getNextIndex();
+    scanned.isRecycled = parser.isRecycled();
     const std::size_t size = buffer.GetSize();
     const vxClassID classID = buffer.GetClassID();
     const boost::shared_ptr<void> block = buffer.Transfer();

@@ -14,39 +14,48 @@
 namespace support {
 namespace {
 
-// Whether a call is to fail, errno being set then.
-bool fails(int call, int failingCall, int error) {
-    const bool isToFail = failingCall != 0 && call >= failingCall;
-    if (isToFail) errno = error;
-    return isToFail;
+// How many of so many bytes may pass; 0, errno being set, when the call is to fail.
+std::size_t allowed(FaultyFile& file, Call call, std::size_t count) {
+    if (file.allow != nullptr) return file.allow(file, call, count);
+    int& calls = call == Call::Read ? file.reads : call == Call::Write ? file.writes : file.seeks;
+    const int failing = call == Call::Read    ? file.failingRead
+                        : call == Call::Write ? file.failingWrite
+                        : call == Call::Seek  ? file.failingSeek
+                                              : 0;
+    if (++calls < failing || failing == 0) return count;
+    errno = file.error;
+    return 0;
 }
 
 ssize_t readBytes(void* cookie, char* buffer, std::size_t size) {
     auto& file = *static_cast<FaultyFile*>(cookie);
-    if (fails(++file.reads, file.failingRead, file.error)) return -1;
+    const std::size_t count = allowed(file, Call::Read, size);
+    if (count == 0 && size != 0) return -1;
     const std::size_t start = std::min(file.offset, file.bytes.size());
-    file.offset = start + file.bytes.copy(buffer, size, start);
+    file.offset = start + file.bytes.copy(buffer, count, start);
     return static_cast<ssize_t>(file.offset - start);
 }
 
 ssize_t writeBytes(void* cookie, const char* buffer, std::size_t size) {
-    auto& file = *static_cast<FaultyFile*>(cookie);
-    if (fails(++file.writes, file.failingWrite, file.error)) return 0;
-    file.bytes.resize(std::max(file.bytes.size(), file.offset + size));
-    file.bytes.replace(file.offset, size, buffer, size);
-    file.offset += size;
-    return static_cast<ssize_t>(size);
+    return static_cast<ssize_t>(static_cast<FaultyFile*>(cookie)->put({buffer, size}));
 }
 
 int seek(void* cookie, off64_t* offset, int whence) {
     auto& file = *static_cast<FaultyFile*>(cookie);
-    if (fails(++file.seeks, file.failingSeek, file.error)) return -1;
+    if (allowed(file, Call::Seek, 1) == 0) return -1;
     const std::size_t origins[] = {0, file.offset, file.bytes.size()};
     static_assert(SEEK_SET == 0 && SEEK_CUR == 1 && SEEK_END == 2);
     *offset += static_cast<off64_t>(origins[whence]);
-    if (*offset < 0) return -1;
+    if (*offset < 0) {
+        errno = EINVAL;
+        return -1;
+    }
     file.offset = static_cast<std::size_t>(*offset);
     return 0;
+}
+
+int closeFile(void* cookie) {
+    return allowed(*static_cast<FaultyFile*>(cookie), Call::Close, 1) == 0 ? -1 : 0;
 }
 
 std::string contentOf(const std::string& path) {
@@ -100,8 +109,18 @@ long OpenedFile::position() {
     return position;
 }
 
+std::size_t FaultyFile::put(std::string_view text) {
+    const std::size_t count = allowed(*this, Call::Write, text.size());
+    if (count == 0) return 0;
+    if (appends) offset = bytes.size();
+    bytes.resize(std::max(bytes.size(), offset + count));
+    bytes.replace(offset, count, text.data(), count);
+    offset += count;
+    return count;
+}
+
 std::FILE* FaultyFile::open(const char* mode, std::size_t bufferSize) {
-    std::FILE* const file = fopencookie(this, mode, {readBytes, writeBytes, seek, nullptr});
+    std::FILE* const file = fopencookie(this, mode, {readBytes, writeBytes, seek, closeFile});
     buffer.resize(bufferSize);
     std::setvbuf(file, buffer.data(), bufferSize == 0 ? _IONBF : _IOFBF, bufferSize);
     return file;

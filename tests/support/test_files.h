@@ -57,18 +57,26 @@ struct OpenedFile {
     Orvandeil::FileIO::fileStream stream;
 };
 
+// What a program asks of the system and of its host.
+enum class Call { Read, Write, Seek, Close, Stat, Memory, HostMemory };
+
 // A file in memory. From a given call on (counted from 1, 0 is never), its reads, writes or seeks
 // fail with `error`, which may be 0.
 struct FaultyFile {
     // The standard library keeps `bufferSize` bytes, or none.
     std::FILE* open(const char* mode, std::size_t bufferSize = 0);
+    // What a write does; the bytes written.
+    std::size_t put(std::string_view text);
 
     std::string bytes;
     std::size_t offset = 0;
     int failingRead = 0, failingWrite = 0, failingSeek = 0;
     int error = 0;
     int reads = 0, writes = 0, seeks = 0;
+    bool appends = false;
     std::string buffer = {};
+    // If there is one, it decides instead: how many of so many bytes may pass. 0 is a failure.
+    std::size_t (*allow)(const FaultyFile& file, Call call, std::size_t count) = nullptr;
 };
 
 }  // namespace support
