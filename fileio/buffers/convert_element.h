@@ -99,7 +99,7 @@ constexpr To saturate(From value) {
 
 // The largest double within the range of an element type of integers.
 template <class To>
-constexpr double highestDouble() {
+consteval double highestDouble() {
     constexpr auto highest = NumberOf<To>::highest;
     constexpr int digits = std::numeric_limits<Number<To>>::digits;
     constexpr int excess = digits > 53 ? digits - 53 : 0;

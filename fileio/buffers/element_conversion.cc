@@ -96,7 +96,7 @@ constexpr std::size_t classIndex(int classID) {
 }
 
 template <class Processor, std::size_t target, std::size_t source>
-constexpr ConvertRun runOf() {
+consteval ConvertRun runOf() {
     using To = typename ElementOf<detail::firstElementClass + static_cast<int>(target)>::type;
     using From = typename ElementOf<detail::firstElementClass + static_cast<int>(source)>::type;
     if constexpr (std::is_void_v<To> || std::is_void_v<From>) {
@@ -111,12 +111,12 @@ using RunsFromClass = std::array<ConvertRun, classCount>;
 using Runs = std::array<RunsFromClass, classCount>;
 
 template <class Processor, std::size_t target, std::size_t... sources>
-constexpr RunsFromClass runsInto(std::index_sequence<sources...>) {
+consteval RunsFromClass runsInto(std::index_sequence<sources...>) {
     return {runOf<Processor, target, sources>()...};
 }
 
 template <class Processor, std::size_t... targets>
-constexpr Runs makeRuns(std::index_sequence<targets...>) {
+consteval Runs makeRuns(std::index_sequence<targets...>) {
     return {runsInto<Processor, targets>(std::make_index_sequence<classCount>())...};
 }
 

@@ -30,7 +30,7 @@ std::u16string message() {
 constexpr std::array<CodeEntry, codeCount> codes = {{FILEIO_FOR_EACH_CODE(FILEIO_CODE_ENTRY)}};
 #undef FILEIO_CODE_ENTRY
 
-constexpr bool inOrder() {
+consteval bool inOrder() {
     for (int i = 0; i < codeCount; ++i) {
         if (codes[static_cast<std::size_t>(i)].code != -1 - i) return false;
     }

@@ -17,7 +17,7 @@ enum CharacterSet : unsigned char {
     Sign = 128
 };
 
-constexpr std::array<unsigned char, 128> makeCharacterSets() {
+consteval std::array<unsigned char, 128> makeCharacterSets() {
     std::array<unsigned char, 128> sets{};
     const auto add = [&sets](std::string_view characters, CharacterSet set) {
         for (const char character : characters)

@@ -19,7 +19,7 @@ struct Significant {
     bool certain;
 };
 
-constexpr std::uint64_t tenToNth(int n) {
+consteval std::uint64_t tenToNth(int n) {
     std::uint64_t power = 1;
     for (; n != 0; --n)
         power *= 10;

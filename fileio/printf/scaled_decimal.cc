@@ -12,7 +12,7 @@ namespace {
 // kept, so that what each step cuts off never reaches those.
 using Wide = std::array<std::uint64_t, 4>;
 
-constexpr Wide timesTen(const Wide& number, std::uint64_t& carry) {
+consteval Wide timesTen(const Wide& number, std::uint64_t& carry) {
     Wide product{};
     carry = 0;
     for (std::size_t i = 0; i < number.size(); ++i) {
@@ -24,7 +24,7 @@ constexpr Wide timesTen(const Wide& number, std::uint64_t& carry) {
 }
 
 // number * 2^64 / 10, less its lowest word: `front` receives the word above it.
-constexpr Wide overTen(const Wide& number, std::uint64_t& front) {
+consteval Wide overTen(const Wide& number, std::uint64_t& front) {
     Wide quotient{};
     front = number[3] / 10;
     std::uint64_t rest = number[3] % 10;
@@ -36,7 +36,7 @@ constexpr Wide overTen(const Wide& number, std::uint64_t& front) {
     return quotient;
 }
 
-constexpr Wide shiftedRight(const Wide& number, std::uint64_t front, int bits) {
+consteval Wide shiftedRight(const Wide& number, std::uint64_t front, int bits) {
     Wide shifted{};
     for (std::size_t i = 0; i < number.size(); ++i) {
         const std::uint64_t above = i + 1 < number.size() ? number[i + 1] : front;
@@ -53,7 +53,7 @@ struct Power {
 };
 using Powers = std::array<Power, largestPower - smallestPower + 1>;
 
-constexpr Powers makePowers() {
+consteval Powers makePowers() {
     Powers powers{};
     Wide number = {0, 0, 0, 1UL << 63};
     for (int power = 0; power <= largestPower; ++power) {

@@ -16,7 +16,7 @@ std::unique_ptr<finFormatPiece> create(const finFormatPieceInitBlock& init) {
 
 // Only 64-bit integers are read into a class of their own; everything else ends up as a double.
 template <template <class> class Functor>
-constexpr ScanConversion signedRow(FORMAT format, const char16_t* letters) {
+consteval ScanConversion signedRow(FORMAT format, const char16_t* letters) {
     return {format,
             letters,
             {create<finFormatPieceT<Functor<int>, vxDOUBLE_CLASS>>,
@@ -25,7 +25,7 @@ constexpr ScanConversion signedRow(FORMAT format, const char16_t* letters) {
 }
 
 template <template <class> class Functor>
-constexpr ScanConversion unsignedRow(FORMAT format, const char16_t* letters) {
+consteval ScanConversion unsignedRow(FORMAT format, const char16_t* letters) {
     return {format,
             letters,
             {create<finFormatPieceT<Functor<unsigned int>, vxDOUBLE_CLASS>>,

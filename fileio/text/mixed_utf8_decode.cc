@@ -34,7 +34,7 @@ struct Tables {
 };
 
 // Describes the window in characters of at most `longest` bytes; false when it has too few.
-constexpr bool describe(Tables& tables, unsigned ends, int characters, unsigned longest) {
+consteval bool describe(Tables& tables, unsigned ends, int characters, unsigned longest) {
     const unsigned laneBytes = longest == 2 ? 2 : 4;
     std::array<std::uint8_t, loadedBytes> shuffle{};
     shuffle.fill(0x80);
@@ -57,7 +57,7 @@ constexpr bool describe(Tables& tables, unsigned ends, int characters, unsigned 
     return true;
 }
 
-constexpr Tables makeTables() {
+consteval Tables makeTables() {
     Tables tables;
     for (unsigned ends = 0; ends < tables.windows.size(); ++ends) {
         if (!describe(tables, ends, shortCharacters, 2) &&

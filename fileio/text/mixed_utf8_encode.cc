@@ -21,7 +21,7 @@ struct Packing {
 };
 using Packings = std::array<Packing, 256>;
 
-constexpr Packing packLanes(unsigned lanes, unsigned laneBytes, unsigned twoOrMore,
+consteval Packing packLanes(unsigned lanes, unsigned laneBytes, unsigned twoOrMore,
                             unsigned three) {
     Packing packing;
     packing.shuffle.fill(0x80);
@@ -34,7 +34,7 @@ constexpr Packing packLanes(unsigned lanes, unsigned laneBytes, unsigned twoOrMo
 }
 
 // By a bit for each of eight lanes of one or two bytes.
-constexpr Packings makeShortPackings() {
+consteval Packings makeShortPackings() {
     Packings packings;
     for (unsigned mask = 0; mask < packings.size(); ++mask)
         packings[mask] = packLanes(8, 2, mask, 0);
@@ -42,7 +42,7 @@ constexpr Packings makeShortPackings() {
 }
 
 // By two bits for each of four lanes of one to three bytes.
-constexpr Packings makeLongPackings() {
+consteval Packings makeLongPackings() {
     Packings packings;
     for (unsigned mask = 0; mask < packings.size(); ++mask)
         packings[mask] = packLanes(4, 4, mask & 0xF, mask >> 4);
