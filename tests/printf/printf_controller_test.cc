@@ -5,6 +5,8 @@
 #include "fileio/text/output_string_stream.h"
 #include "tests/support/printing.h"
 
+#include <array>
+#include <cstdio>
 #include <limits>
 
 #include <gtest/gtest.h>
@@ -81,6 +83,26 @@ TEST(PrintfController, ConvertsObjectsAndNamesWhatTheyDoWrong) {
     EXPECT_EQ(outcome("%s", makeString({})), "KESTRA:string:MissingNotSupported");
     EXPECT_EQ(outcome("%c", makeString({})), "KESTRA:string:MissingNotSupported");
     EXPECT_EQ(outcome("%d", makeString(u"12")), "KESTRA:UnableToConvert");
+}
+
+// Beyond the digits that any double has, with all flags and with widths about the length.
+TEST(PrintfController, PrintsLongPrecisionsAsTheCLibraryDoes) {
+    std::string text(4096, '\0');
+    for (std::size_t code = 0; code < 32 * 3 * 4 * 5; ++code) {
+        std::string format = "%";
+        for (std::size_t i = 0; i < 5; ++i)
+            format += code >> i & 1 ? std::string(1, "-+ #0"[i]) : "";
+        const std::size_t rest = code / 32;
+        format += std::array{"", "1104", "2000"}[rest % 3];
+        format += std::array{".1099", ".1100", ".1101", ".1500"}[rest / 3 % 4];
+        format += "eEfgG"[rest / 12];
+        for (const double value : {0.1, -2.5e300, 5e-324, 0.0, 1e22}) {
+            const int length = std::snprintf(text.data(), text.size(), format.c_str(), value);
+            EXPECT_EQ(print(format, makeScalar(value)).text,
+                      text.substr(0, static_cast<std::size_t>(length)))
+                << format;
+        }
+    }
 }
 
 // A stream of the caller's own sees each piece as a promise of size and one write, and every pad as
