@@ -72,6 +72,7 @@ constexpr PrintRow printRows[] = {
     {u"%bx %tu %o", 0},
     {u"%700d|%-400s", 0},
     {u"%s %d;", 3},
+    {u"%-1210.1200e", 2},
 };
 
 void printTo(TcodnStream& stream, const PrintRow& row) {
