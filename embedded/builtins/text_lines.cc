@@ -3,6 +3,8 @@
 #include "fileio/buffers/host_block.h"
 #include "fileio/buffers/output_buffer.h"
 
+#include <iterator>
+
 namespace Orvandeil::FileIO::embedded {
 namespace {
 
@@ -22,6 +24,18 @@ private:
     OutputBuffer& buffer;
 };
 
+std::size_t keptOf(const Line& line, std::size_t count, Terminators terminators) {
+    return terminators == Terminators::Kept ? count : count - static_cast<std::size_t>(line.result);
+}
+
+// By far the most lines lie in what the file has read ahead, and need no buffer.
+bool takeLineAhead(OpenFile& file, Line& line, Terminators terminators) {
+    char16_t units[OpenFile::usualLine];
+    const std::size_t count = file.stream->takeLineAhead(units, std::size(units), line.result);
+    line.text.append(units, count == 0 ? 0 : keptOf(line, count, terminators));
+    return count != 0;
+}
+
 // The first chunk has at least the usual size, so that a line of it is in one piece.
 void copyTo(std::u16string& text, OutputBuffer& units, std::size_t count) {
     if (units.GetSize() <= OpenFile::usualLine) {
@@ -40,6 +54,7 @@ bool readLine(OpenFile& file, Line& line, long maxCharacters, Terminators termin
     line.failure.reset();
     requireReadable(file);
     beginTransfer(file, Direction::Reading);
+    if (maxCharacters == anyLength && takeLineAhead(file, line, terminators)) return true;
     OutputBuffer& units = file.lineUnits;
     const Emptied emptied(units);
     const int codeBefore = file.stream->getErrorCode();
@@ -52,8 +67,7 @@ bool readLine(OpenFile& file, Line& line, long maxCharacters, Terminators termin
     }
     // What could not be decoded is part of the line; the system's errors are not.
     if (code > 0 && code != codeBefore) line.failure = file.failure(code);
-    const auto dropped = terminators == Terminators::Dropped ? line.result : 0;
-    copyTo(line.text, units, count - static_cast<std::size_t>(dropped));
+    copyTo(line.text, units, keptOf(line, count, terminators));
     return true;
 }
 

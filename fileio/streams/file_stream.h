@@ -87,6 +87,11 @@ public:
     // end-of-file indicator is set when nothing is left behind the line.
     virtual int GetLine(long maxCharacters, OutputBuffer& out);
 
+    // The same, without a limit, for a line that lies with its terminator, and with something
+    // behind it, in what the file has read ahead: returns its units. 0, and nothing is taken, for
+    // any other line, a longer one than `room` and streams of other classes.
+    std::size_t takeLineAhead(char16_t* units, std::size_t room, int& result);
+
     // Moves to a position in bytes. 0, or non-zero with the error code set.
     virtual int setPosition(long position);
 

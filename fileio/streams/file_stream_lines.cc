@@ -47,6 +47,32 @@ Body decodeBody(detail::DirectForm form, std::string_view bytes, char16_t* units
     const bool isWhole = rest.taken == body && body != bytes.size();
     return {{done.taken + rest.taken, done.made + rest.made}, isWhole};
 }
+
+// What lies ahead of a line, and how the line ended there: 0 when that takes reading on.
+struct LineStart {
+    std::size_t units;
+    const char* next;
+    std::size_t givenBack = 0;
+    int result = 0;
+};
+
+LineStart decodeLine(const detail::UnitsAhead& ahead, std::string_view bytes, char16_t* units,
+                     std::size_t room) {
+    const detail::DirectForm form = ahead.form();
+    const Body body = decodeBody(form, bytes, units, room);
+    LineStart line = {body.decoded.made, bytes.data() + body.decoded.taken};
+    const char* const end = bytes.data() + bytes.size();
+    // The terminator, what follows it, and room for both.
+    if (!body.isWhole || end - line.next < 2 || room - line.units < 2) return line;
+    char16_t following = 0;
+    line.givenBack = ahead.decodeUnit(form, line.next + 1, end, following);
+    if (line.givenBack != 0) line.result = 1;
+    if (*line.next == carriageReturn && following == lineFeed) line.result = 2;
+    if (line.result == 2) line.givenBack = 0;
+    for (int i = 0; i < line.result; ++i)
+        units[line.units++] = static_cast<unsigned char>(*line.next++);
+    return line;
+}
 #endif
 
 }  // namespace
@@ -73,37 +99,39 @@ int fileStream::GetLine(long maxCharacters, OutputBuffer& out) {
     return result;
 }
 
+std::size_t fileStream::takeLineAhead(char16_t* units, std::size_t room, int& result) {
+#ifdef FILEIO_FAST_PATHS
+    detail::UnitsAhead ahead(*this);
+    const std::string_view bytes = ahead.bytes();
+    if (bytes.empty() || !detail::isAsciiTransparent(ahead.form())) return 0;
+    const LineStart line = decodeLine(ahead, bytes, units, room);
+    // The end of what was read ahead may be that of the file, which has to be looked for.
+    if (line.result == 0 || line.next == bytes.data() + bytes.size()) return 0;
+    ahead.take(bytes.data(), line.next, line.givenBack);
+    result = line.result;
+    return line.units;
+#else
+    static_cast<void>(units), static_cast<void>(room), static_cast<void>(result);
+    return 0;
+#endif
+}
+
 #ifdef FILEIO_FAST_PATHS
 // Takes the units of a line that need neither more bytes nor more memory nor the converter, at most
 // `limit` unless negative, and the terminator with it if that is clear without reading on. Returns
 // their number.
 long fileStream::takeOfLine(long limit, OutputBuffer& out, int& result) {
     detail::UnitsAhead ahead(*this);
-    const detail::DirectForm form = ahead.form();
     std::size_t room = out.getFreeRoom();
     if (limit > 0) room = std::min(room, static_cast<std::size_t>(limit));
-    if (room == 0 || !detail::isAsciiTransparent(form)) return 0;
     const std::string_view bytes = ahead.bytes();
-    if (bytes.empty()) return 0;
-    const char* const end = bytes.data() + bytes.size();
+    if (room == 0 || bytes.empty() || !detail::isAsciiTransparent(ahead.form())) return 0;
     auto* const units = static_cast<char16_t*>(out.Allocate(room));
-    const Body body = decodeBody(form, bytes, units, room);
-    const char* next = bytes.data() + body.decoded.taken;
-    std::size_t made = body.decoded.made;
-    std::size_t givenBack = 0;
-    // The terminator, what follows it, and room for both.
-    if (body.isWhole && end - next >= 2 && room - made >= 2) {
-        char16_t following = 0;
-        givenBack = ahead.decodeUnit(form, next + 1, end, following);
-        if (givenBack != 0) result = 1;
-        if (*next == carriageReturn && following == lineFeed) result = 2;
-        if (result == 2) givenBack = 0;
-        for (int i = 0; i < result; ++i)
-            units[made++] = static_cast<unsigned char>(*next++);
-    }
-    out.SetLastChunkSize(made);
-    ahead.take(bytes.data(), next, givenBack);
-    return static_cast<long>(made);
+    const LineStart line = decodeLine(ahead, bytes, units, room);
+    out.SetLastChunkSize(line.units);
+    ahead.take(bytes.data(), line.next, line.givenBack);
+    result = line.result;
+    return static_cast<long>(line.units);
 }
 #endif
 

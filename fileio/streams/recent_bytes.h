@@ -1,6 +1,5 @@
 #pragma once
 
-#include <algorithm>
 #include <cstdio>
 
 namespace Orvandeil::FileIO::detail {
@@ -11,10 +10,14 @@ class RecentBytes {
 public:
     void add(int byte) {
         bytes = bytes << 8 | static_cast<unsigned char>(byte);
-        count = std::min(count + 1, capacity);
+        if (count != capacity) ++count;
     }
     void add(const char* read, unsigned long size) {
-        for (unsigned long i = size - std::min(size, capacity); i < size; ++i)
+        if (size >= capacity) {
+            addAll(read + (size - capacity));
+            return;
+        }
+        for (unsigned long i = 0; i < size; ++i)
             add(read[i]);
     }
     void clear() { count = 0; }
@@ -36,6 +39,14 @@ public:
 
 private:
     static constexpr unsigned long capacity = sizeof(unsigned long);
+
+    void addAll(const char* read) {
+        unsigned long newest = 0;
+        for (unsigned long i = 0; i < capacity; ++i)
+            newest = newest << 8 | static_cast<unsigned char>(read[i]);
+        bytes = newest;
+        count = capacity;
+    }
 
     unsigned long bytes = 0;  // the newest lowest
     unsigned long count = 0;

@@ -9,6 +9,12 @@
 
 namespace Orvandeil::FileIO::detail {
 
+#ifdef __SSE2__
+static __m128i load(const void* place) {
+    return _mm_loadu_si128(static_cast<const __m128i*>(place));
+}
+#endif
+
 // A block is compared with every gap: with more of them the table is as fast.
 void AsciiSet::findGaps() {
     constexpr std::size_t mostGaps = 6;
@@ -27,9 +33,6 @@ void AsciiSet::findGaps() {
 std::size_t AsciiSet::lengthOf(const char* bytes, std::size_t count) const {
     std::size_t i = 0;
 #ifdef __SSE2__
-    const auto load = [](const void* place) {
-        return _mm_loadu_si128(static_cast<const __m128i*>(place));
-    };
     for (; count - i >= blockBytes && !gaps.empty(); i += blockBytes) {
         const __m128i block = load(bytes + i);
         __m128i others = block;  // of which the highest bit counts
@@ -48,12 +51,16 @@ std::size_t AsciiSet::lengthOf(const char* bytes, std::size_t count) const {
 }
 
 void widenAscii(const char* bytes, std::size_t count, std::size_t room, char16_t* out) {
-    constexpr std::size_t block = 16;
     std::size_t i = 0;
+#ifdef __SSE2__
+    constexpr std::size_t block = sizeof(__m128i);
     for (; i < count && room - i >= block; i += block) {
-        for (std::size_t k = 0; k < block; ++k)
-            out[i + k] = static_cast<unsigned char>(bytes[i + k]);
+        const __m128i ascii = load(bytes + i);
+        auto* const units = reinterpret_cast<__m128i*>(out + i);
+        _mm_storeu_si128(units, _mm_unpacklo_epi8(ascii, _mm_setzero_si128()));
+        _mm_storeu_si128(units + 1, _mm_unpackhi_epi8(ascii, _mm_setzero_si128()));
     }
+#endif
     for (; i < count; ++i)
         out[i] = static_cast<unsigned char>(bytes[i]);
 }

@@ -121,11 +121,15 @@ FILEIO_FOR_SSSE3 void widen(__m128i block, char16_t* out) {
     _mm_storeu_si128(target + 1, _mm_unpackhi_epi8(block, _mm_setzero_si128()));
 }
 
-// As bits, the bytes that end a line.
-FILEIO_FOR_SSSE3 unsigned lineEnds(__m128i block) {
+FILEIO_FOR_SSSE3 unsigned highestBits(__m128i block) {
+    return static_cast<unsigned>(_mm_movemask_epi8(block));
+}
+
+// The bytes that end a line, as masks.
+FILEIO_FOR_SSSE3 __m128i lineEnds(__m128i block) {
     const __m128i feeds = _mm_cmpeq_epi8(block, _mm_set1_epi8('\n'));
     const __m128i carriages = _mm_cmpeq_epi8(block, _mm_set1_epi8('\r'));
-    return static_cast<unsigned>(_mm_movemask_epi8(_mm_or_si128(feeds, carriages)));
+    return _mm_or_si128(feeds, carriages);
 }
 
 // Goes to the end of a line only, if asked to.
@@ -136,17 +140,20 @@ FILEIO_FOR_SSSE3 Progress decodeWindows(const char* bytes, std::size_t count, ch
     std::size_t made = 0;
     while (count - taken >= loadedBytes && room - made >= loadedBytes) {
         const __m128i block = load(bytes + taken);
-        const unsigned ends = isLine ? lineEnds(block) : 0;
-        const auto endsAt = static_cast<unsigned>(std::countr_zero(ends));
-        if (_mm_movemask_epi8(block) == 0) {
-            widen(block, out + made);
-            if (ends != 0) return {taken + endsAt, made + endsAt};
+        const __m128i endMasks = isLine ? lineEnds(block) : _mm_setzero_si128();
+        const bool isPlain = highestBits(_mm_or_si128(block, endMasks)) == 0;
+        const bool isAscii = isPlain || highestBits(block) == 0;
+        if (isAscii) widen(block, out + made);
+        if (isPlain) {
             taken += loadedBytes;
             made += loadedBytes;
             continue;
         }
+        const unsigned ends = highestBits(endMasks);
+        const auto endsAt = static_cast<unsigned>(std::countr_zero(ends));
+        if (isAscii) return {taken + endsAt, made + endsAt};
         const __m128i trails = _mm_cmplt_epi8(block, _mm_set1_epi8(static_cast<char>(0xC0)));
-        const auto begins = ~static_cast<unsigned>(_mm_movemask_epi8(trails));
+        const unsigned begins = ~highestBits(trails);
         const Window window = tables.windows[begins >> 1 & ((1U << windowBytes) - 1)];
         if (window.shuffle == noShuffle) break;
         const __m128i lanes = _mm_shuffle_epi8(block, load(&tables.shuffles[window.shuffle]));

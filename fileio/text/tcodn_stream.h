@@ -96,6 +96,7 @@ private:
     void openDetected(const std::string& detected);
     // Whether the encoding, now decided, is UTF-16.
     bool writesUnits();
+    unsigned long readUnits(char16_t* out, unsigned long n, std::size_t* bytesConsumed);
     Undecoded readUndecoded(unsigned long wanted);
     unsigned long decode(Undecoded& bytes, char16_t* out, unsigned long room);
     unsigned long convert(Undecoded& bytes, char16_t* out, unsigned long room, UConverter* from);

@@ -110,6 +110,18 @@ TcodnStream::Undecoded TcodnStream::readUndecoded(unsigned long wanted) {
 
 unsigned long TcodnStream::GetNCodePoints(char16_t* out, unsigned long n,
                                           std::size_t* bytesConsumed) {
+#ifdef FILEIO_FAST_PATHS
+    if (n == 1 && detail::UnitsAhead(*this).takeAscii(*out)) {
+        if (bytesConsumed) *bytesConsumed = 1;
+        return 1;
+    }
+#endif
+    return readUnits(out, n, bytesConsumed);
+}
+
+// Apart from one unit taken as it is, which needs nothing on the stack.
+[[gnu::noinline]] unsigned long TcodnStream::readUnits(char16_t* out, unsigned long n,
+                                                       std::size_t* bytesConsumed) {
     std::size_t unused = 0;
     std::size_t& consumed = bytesConsumed ? *bytesConsumed : unused;
     consumed = 0;

@@ -33,6 +33,19 @@ public:
     template <class Judge>
     bool takeWhile(Judge judge);
 
+    // Takes one unit if it is an ASCII character of a file, which is the least that one can cost.
+    bool takeAscii(char16_t& unit) {
+        if (!file || !stream.readsAsciiAsIs()) return false;
+        const std::string_view ahead = bytesReadAhead(file->file);
+        if (ahead.empty() || static_cast<signed char>(ahead.front()) < 0) return false;
+        const auto byte = static_cast<unsigned char>(ahead.front());
+        unit = byte;
+        file->lastByteRead = byte;
+        file->recentBytes.add(byte);
+        takeReadAhead(file->file, ahead.data() + 1);
+        return true;
+    }
+
     // Takes up to `n` units, and returns their number and that of their bytes: as many as there are
     // in memory; of a file, which is read in larger pieces, only if it is enough.
     unsigned long takeUnits(char16_t* out, unsigned long n, std::size_t& consumed);

@@ -10,11 +10,17 @@ namespace {
 using namespace Orvandeil::FileIO;
 
 // Every line as its text and its result, then "$" as soon as the end of the file shows.
-std::string linesOf(fileStream& stream, long max) {
+std::string linesOf(fileStream& stream, long max, std::size_t roomAhead) {
     std::string summary;
     for (std::size_t chunk = 4;; chunk = 404 - chunk) {
+        char16_t ahead[40];
         OutputBuffer line(vxCHAR_CLASS, 16, chunk, 64);
-        const int result = stream.GetLine(max, line);
+        int result = -1;
+        if (const std::size_t units = stream.takeLineAhead(ahead, roomAhead, result)) {
+            line.AppendData(vxCHAR_CLASS, ahead, units);
+        } else {
+            result = stream.GetLine(max, line);
+        }
         const std::size_t units = line.GetSize();
         if (units == 0) return summary + " code " + std::to_string(stream.getErrorCode());
         const auto text = line.Transfer();
@@ -48,6 +54,7 @@ void lines(Bytes& input) {
                                            u"\x1A", u"xyz ", u"\n\n", u"\x85", u"\u2028", u"\0"};
     const char* const encoding = input.of(statelessEncodings);
     const long max = input.below(2) == 0 ? -1 : static_cast<long>(input.below(14)) - 2;
+    const std::size_t roomAhead = max == -1 ? input.below(41) : 0;
     const std::size_t bufferSize = 1 + input.below(40);
     const bool canSeek = input.below(2) == 0;
     MemoryStream encoder(encoding);
@@ -61,7 +68,7 @@ void lines(Bytes& input) {
     decoder.GetNCodePoints(text, bytes.size(), nullptr);
     support::FaultyFile memory{.bytes = bytes, .failingSeek = canSeek ? 0 : 1, .error = ESPIPE};
     support::OpenedFile opened(memory.open("r", bufferSize), "r", encoding);
-    const std::string seen = linesOf(opened.stream, max);
+    const std::string seen = linesOf(opened.stream, max, roomAhead);
     requireEqual(seen, modelOf(text, max),
                  encoding + (" at most " + std::to_string(max)) + " of " + bytes);
     input.observe(seen);
