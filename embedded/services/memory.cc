@@ -7,6 +7,7 @@
 #include <cerrno>
 #include <cstdint>
 #include <cstdlib>
+#include <malloc.h>
 
 #include <sys/mman.h>
 #if __has_include(<sys/single_threaded.h>)
@@ -62,20 +63,34 @@ void* counted(void* block) {
 }
 
 // Asks for huge pages below a large block: most of the time that filling a new one takes goes into
-// page faults otherwise. It is advice, so that nothing depends on the answer.
+// page faults otherwise. It is advice, so that nothing depends on the answer. The pages at both
+// ends are among them: a mapping of two kinds of pages can no longer be moved to where it can grow,
+// and would be copied.
 void* advised(void* block, [[maybe_unused]] std::size_t bytes) {
 #ifdef FILEIO_FAST_PATHS
     constexpr std::size_t leastBytes = std::size_t{4} << 20;
     constexpr std::uintptr_t pageBytes = 4096;
     if (block == nullptr || bytes < leastBytes) return block;
     const auto start = reinterpret_cast<std::uintptr_t>(block);
-    const std::uintptr_t firstPage = (start + pageBytes - 1) / pageBytes * pageBytes;
-    const std::size_t length = (start + bytes - firstPage) / pageBytes * pageBytes;
+    const std::uintptr_t firstPage = start / pageBytes * pageBytes;
+    const std::uintptr_t end = (start + bytes + pageBytes - 1) / pageBytes * pageBytes;
     const int keptErrno = errno;
-    madvise(reinterpret_cast<void*>(firstPage), length, MADV_HUGEPAGE);
+    madvise(reinterpret_cast<void*>(firstPage), end - firstPage, MADV_HUGEPAGE);
     errno = keptErrno;
 #endif
     return block;
+}
+
+// A large block that keeps most of its size stays as it is: pages that were never written take no
+// memory, and the allocator learns from the size of what is freed which sizes come back.
+bool isCutLittle([[maybe_unused]] void* block, [[maybe_unused]] std::size_t bytes) {
+#ifdef FILEIO_FAST_PATHS
+    constexpr std::size_t leastBytes = std::size_t{128} << 10;
+    const std::size_t present = malloc_usable_size(block);
+    return bytes >= leastBytes && bytes <= present && bytes >= present / 2;
+#else
+    return false;
+#endif
 }
 
 }  // namespace
@@ -125,8 +140,9 @@ void* vxMemoryAllocateZeroedOrRaise(std::size_t count, std::size_t size) {
 void* vxMemoryReallocateOrRaise(void* block, std::size_t bytes) {
     if (block == nullptr) return vxMemoryAllocateOrRaise(bytes);
     if (bytes <= largestBlock && mayAllocate()) {
+        if (isCutLittle(block, bytes)) return block;
         void* const moved = std::realloc(block, std::max<std::size_t>(bytes, 1));
-        if (moved != nullptr) return moved == block ? moved : advised(moved, bytes);
+        if (moved != nullptr) return advised(moved, bytes);
     }
     vxMemoryRaiseExhausted();
 }
