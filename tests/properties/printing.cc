@@ -115,7 +115,7 @@ void compareWithC(Bytes& input, const ArrayPtr& array, const std::string& before
 }
 
 // Values that are hard in their own ways: any bits, few decimals, halves, decimal halves,
-// neighbours of powers of ten, whole numbers, singles.
+// neighbours of powers of ten, whole numbers, singles; about as long as a word of digits.
 double hardNumber(std::size_t kind, std::mt19937_64& random) {
     const auto power = [&](unsigned count) { return std::pow(10, random() % count); };
     switch (kind) {
@@ -133,8 +133,12 @@ double hardNumber(std::size_t kind, std::mt19937_64& random) {
                                   random() % 2 == 0 ? 0 : INFINITY);
         case 5:
             return static_cast<double>(static_cast<long>(random()) >> random() % 64);
-        default:
+        case 6:
             return std::bit_cast<float>(static_cast<std::uint32_t>(random()));
+        case 7:
+            return static_cast<int>(random()) / 21;
+        default:
+            return static_cast<double>(random() >> (31 + random() % 33));
     }
 }
 
@@ -148,10 +152,13 @@ void againstC(Bytes& input) {
     compareWithC(input, array, before, start, static_cast<int>(width), conversion, after);
     if (input.empty()) return;
     const ArrayPtr hard = makeNumeric(vxDOUBLE_CLASS, {1, 50});
-    const std::size_t kind = input.below(7);
+    const std::size_t kind = input.below(9);
     std::mt19937_64 random(input.number(8));
     for (std::size_t i = 0; i < 50; ++i)
         static_cast<double*>(realData(*hard))[i] = hardNumber(kind, random);
+    if (kind >= 7) {
+        return compareWithC(input, hard, "", "%", 0, input.of(std::string_view("duxX")), after);
+    }
     const std::string precision = "%." + std::to_string(input.below(18));
     compareWithC(input, hard, "", precision, 0, input.of(std::string_view("efg")), "\n");
 }
@@ -261,16 +268,19 @@ Arguments listed(const std::vector<ArrayPtr>& owned, std::size_t times) {
 }
 
 // More of the same, with memory or a disk that comes to its end.
-void withFailures(Bytes& input, const std::string& text, const std::string& encoding,
+void withFailures(Bytes& input, std::string text, const std::string& encoding,
                   std::vector<ArrayPtr>& owned) {
     static const std::size_t bufferSizes[] = {4096, 4100, 8192};
-    const std::size_t times = 1 + input.below(30);
+    static const std::string plain[] = {"%d", "%d,", "%u;%x ", "%g|%i\n", "%c", "%s\n"};
+    if (input.below(2) == 0) text = input.of(plain);
+    const std::size_t times = 1 + input.below(200);
     if (text.size() % 2 == 0) {
         for (ArrayPtr& argument : owned)
             argument = tiled(std::move(argument), times);
     }
     const Arguments arguments = listed(owned, text.size() % 2 == 0 ? 1 : times);
-    Failures failures = {.allocation = input.below(60), .bufferSize = input.of(bufferSizes)};
+    Failures failures = {.allocation = input.below(input.below(4) == 0 ? 60 : 5),
+                         .bufferSize = input.of(bufferSizes)};
     const std::u16string format =
         fileio_tests::toUtf16(text + std::string(input.below(4) == 0 ? input.below(400) : 0, '*'));
     requireEqual(printToString<outputStringStream>(encoding, format, arguments, failures),
