@@ -30,6 +30,8 @@ inline constexpr std::size_t reservedChunkBytes = 16;
 inline constexpr std::size_t elementBlockBytes = 1000;
 // Elements made ready for that at once.
 inline constexpr std::size_t elementSlice = 5;
+// Whole numbers taken apart at once.
+inline constexpr std::size_t wholeRun = 4;
 #else
 inline constexpr std::size_t transferPieceBytes = 1048576;
 inline constexpr std::size_t conversionPieceBytes = 65536;
@@ -42,6 +44,7 @@ inline constexpr std::size_t paddingBlockUnits = 256;
 inline constexpr std::size_t reservedChunkBytes = 1048576;
 inline constexpr std::size_t elementBlockBytes = 4032;
 inline constexpr std::size_t elementSlice = 256;
+inline constexpr std::size_t wholeRun = 16;
 #endif
 
 }  // namespace Orvandeil::FileIO::constants

@@ -3,6 +3,7 @@
 #include "fileio/buffers/element_conversion.h"
 #include "fileio/printf/fout_format_pieces.h"
 #include "fileio/printf/number_field.h"
+#include "fileio/printf/whole_run.h"
 #include "fileio/text/tcodn_stream.h"
 
 #include <algorithm>
@@ -186,6 +187,10 @@ void ElementProgram::run(printfArgumentSource& source, foutFormatPiece*& current
     }
 }
 
+std::size_t ElementProgram::room(const char* out) const {
+    return static_cast<std::size_t>(block.data() + block.size() - out);
+}
+
 template <class Element>
 void ElementProgram::runAs(printfArgumentSource& source, vxClassID asClass, std::size_t count) {
     const std::size_t elementBytes = fiPkGetSizeFromClassID(elements.classID);
@@ -193,7 +198,8 @@ void ElementProgram::runAs(printfArgumentSource& source, vxClassID asClass, std:
     const Step* const begin = steps.data();
     const Step* const end = begin + steps.size();
     const Step* step = begin;
-    const char* const blockEnd = block.data() + block.size();
+    const bool isRun = steps.size() == 1 && isRunForm(step->form, step->behind);
+    const std::size_t runBytes = mostRunBytes(step->behind);
     char* out = std::copy(front.begin(), front.end(), block.data());
     blockBegin = {0, 0};
     for (std::size_t done = 0; done < count;) {
@@ -202,7 +208,15 @@ void ElementProgram::runAs(printfArgumentSource& source, vxClassID asClass, std:
                            wanted);
         for (std::size_t i = 0; i < wanted; ++i) {
             const Place here = {step->pieceIndex, done + i};
-            if (static_cast<std::size_t>(blockEnd - out) < step->mostBytes) out = flush(out, here);
+            if (isRun && i % wholeRun == 0 && wanted - i >= wholeRun) {
+                if (room(out) < runBytes) out = flush(out, here);
+                if (char* const written = writeRun(out, step->form, step->behind, slice + i)) {
+                    out = written;
+                    i += wholeRun - 1;
+                    continue;
+                }
+            }
+            if (room(out) < step->mostBytes) out = flush(out, here);
             if (char* const written = writeElement(out, *step, slice[i])) {
                 out = written;
             } else {

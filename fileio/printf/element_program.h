@@ -57,6 +57,7 @@ private:
     template <class Element>
     static char* writeElement(char* out, const Step& step, Element value);
     void printByPiece(const Step& step, printfArgumentSource& source, std::size_t element);
+    std::size_t room(const char* out) const;
     char* flush(const char* end, Place next);
     void settlePart(std::size_t written);
     std::size_t bytesOfPiece(Place place) const;
