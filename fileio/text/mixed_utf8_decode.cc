@@ -1,13 +1,12 @@
+#include "fileio/buffers/vector_unit.h"
 #include "fileio/text/mixed_utf8.h"
 
-#if defined(FILEIO_FAST_PATHS) && defined(__x86_64__)
+#ifdef FILEIO_VECTOR_UNITS
 
 #include <array>
 #include <bit>
 #include <cstdint>
 #include <tmmintrin.h>
-
-#define FILEIO_FOR_SSSE3 [[gnu::target("ssse3,popcnt")]]
 
 namespace Orvandeil::FileIO::detail {
 namespace {
@@ -169,20 +168,16 @@ FILEIO_FOR_SSSE3 Progress decodeWindows(const char* bytes, std::size_t count, ch
     return {taken, made};
 }
 
-bool hasInstructions() {
-    return __builtin_cpu_supports("ssse3") && __builtin_cpu_supports("popcnt");
-}
-
 }  // namespace
 
 Progress decodeMixedUtf8(const char* bytes, std::size_t count, char16_t* out, std::size_t room) {
-    if (!hasInstructions()) return {0, 0};
+    if (!hasSsse3()) return {0, 0};
     return decodeWindows<false>(bytes, count, out, room);
 }
 
 Progress decodeMixedUtf8Line(const char* bytes, std::size_t count, char16_t* out,
                              std::size_t room) {
-    if (!hasInstructions()) return {0, 0};
+    if (!hasSsse3()) return {0, 0};
     return decodeWindows<true>(bytes, count, out, room);
 }
 

@@ -1,12 +1,11 @@
+#include "fileio/buffers/vector_unit.h"
 #include "fileio/text/mixed_utf8.h"
 
-#if defined(FILEIO_FAST_PATHS) && defined(__x86_64__)
+#ifdef FILEIO_VECTOR_UNITS
 
 #include <array>
 #include <cstdint>
 #include <tmmintrin.h>
-
-#define FILEIO_FOR_SSSE3 [[gnu::target("ssse3")]]
 
 namespace Orvandeil::FileIO::detail {
 namespace {
@@ -127,7 +126,7 @@ FILEIO_FOR_SSSE3 Progress encodeBlocks(const char16_t* text, std::size_t units, 
 }  // namespace
 
 Progress encodeMixedUtf8(const char16_t* text, std::size_t units, char* out) {
-    if (!__builtin_cpu_supports("ssse3")) return {0, 0};
+    if (!hasSsse3()) return {0, 0};
     return encodeBlocks(text, units, out);
 }
 
