@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # check_hardening.sh READELF FILE...: every file is position-independent, has a stack that cannot be
-# executed and symbols bound at start into read-only memory, and checks its stack and buffers.
+# executed and symbols bound at start into read-only memory, and checks its stack and buffers. None
+# looks for its libraries in the current folder, which an empty path stands for.
 set -euo pipefail
 readelf=$1
 shift
@@ -21,6 +22,7 @@ for file in "$@"; do
     expect "$file" "stack protector" "UND __stack_chk_fail" "$imports"
     # The host has nothing to fortify.
     [[ $file == *embedded* ]] || expect "$file" "fortified calls" "UND __\w+_chk@" "$imports"
+    ! grep -E 'PATH.*(\[|:)(:|\])' <<<"$dynamic" || failed=1
     [[ $file == *.so* ]] || expect "$file" "PIE" "\(FLAGS_1\).*PIE" "$dynamic"
 done
 exit $failed
