@@ -25,8 +25,8 @@ void linesByOurs(Trial& trial, const std::string& path) {
         const auto file = openUtf8(path);
         embedded::Line line;
         while (embedded::readLine(*file, line, embedded::anyLength, embedded::Terminators::Kept)) {
-            keep(line.text.data());
-            trial.result(std::u16string_view(line.text));
+            keep(line.text().data());
+            trial.result(line.text());
         }
     });
 }

@@ -15,12 +15,12 @@ namespace {
 void show(const embedded::Line& line, embedded::Terminators terminators, Report& report) {
     if (report.isJson()) {
         report.object().startObject();
-        report.key("text", line.text);
+        report.key("text", line.text());
         report.key("result", line.result);
         report.object().endObject();
         return;
     }
-    forEachUtf8Slice(line.text, [&](std::string_view slice) { report.print(slice); });
+    forEachUtf8Slice(line.text(), [&](std::string_view slice) { report.print(slice); });
     if (terminators == embedded::Terminators::Dropped) report.print("\n");
 }
 

@@ -1,6 +1,5 @@
 #include "embedded/builtins/text_lines.h"
 
-#include "fileio/buffers/host_block.h"
 #include "fileio/buffers/output_buffer.h"
 
 #include <iterator>
@@ -32,25 +31,26 @@ std::size_t keptOf(const Line& line, std::size_t count, Terminators terminators)
 bool takeLineAhead(OpenFile& file, Line& line, Terminators terminators) {
     char16_t units[OpenFile::usualLine];
     const std::size_t count = file.stream->takeLineAhead(units, std::size(units), line.result);
-    line.text.append(units, count == 0 ? 0 : keptOf(line, count, terminators));
+    line.usualText.append(units, count == 0 ? 0 : keptOf(line, count, terminators));
     return count != 0;
 }
 
 // The first chunk has at least the usual size, so that a line of it is in one piece.
-void copyTo(std::u16string& text, OutputBuffer& units, std::size_t count) {
+void takeText(Line& line, OutputBuffer& units, std::size_t count) {
     if (units.GetSize() <= OpenFile::usualLine) {
         units.ResetNext();
-        text.assign(static_cast<const char16_t*>(units.GetNext()), count);
+        line.usualText.assign(static_cast<const char16_t*>(units.GetNext()), count);
     } else {
-        const detail::HostBytes joined(static_cast<char*>(units.TransferRaw()));
-        text.assign(reinterpret_cast<const char16_t*>(joined.get()), count);
+        line.block.reset(static_cast<char*>(units.TransferRaw()));
+        line.blockUnits = count;
     }
 }
 
 }  // namespace
 
 bool readLine(OpenFile& file, Line& line, long maxCharacters, Terminators terminators) {
-    line.text.clear();
+    line.usualText.clear();
+    line.block.reset();
     line.failure.reset();
     requireReadable(file);
     beginTransfer(file, Direction::Reading);
@@ -67,7 +67,7 @@ bool readLine(OpenFile& file, Line& line, long maxCharacters, Terminators termin
     }
     // What could not be decoded is part of the line; the system's errors are not.
     if (code > 0 && code != codeBefore) line.failure = file.failure(code);
-    copyTo(line.text, units, keptOf(line, count, terminators));
+    takeText(line, units, keptOf(line, count, terminators));
     return true;
 }
 

@@ -1,14 +1,25 @@
 #pragma once
 
 #include "embedded/builtins/open_file.h"
+#include "fileio/buffers/host_block.h"
 
+#include <cstddef>
 #include <optional>
 #include <string>
+#include <string_view>
 
 namespace Orvandeil::FileIO::embedded {
 
 struct Line {
-    std::u16string text;
+    // Until the line is read into again.
+    std::u16string_view text() const {
+        if (!block) return usualText;
+        return {reinterpret_cast<const char16_t*>(block.get()), blockUnits};
+    }
+
+    std::u16string usualText;
+    detail::HostBytes block;  // of a longer text, in its place
+    std::size_t blockUnits = 0;
     int result = 0;  // 1: ended by one line feed or carriage return, 2: by both, 0: otherwise
     // What cut the line short, or lost what stands behind it.
     std::optional<Failure> failure = std::nullopt;

@@ -137,7 +137,7 @@ TEST(OpenFile, IsPrintedAndRead) {
     seek(*file, 5, Origin::Begin);
     EXPECT_EQ(codeOf([&] { seek(*file, 6, Origin::Begin); }), code::BadOffsetAfterEnd);
     rewind(*file);
-    EXPECT_EQ(readLine(*file)->text, u"12345");
+    EXPECT_EQ(readLine(*file)->text(), u"12345");
     EXPECT_TRUE(endOfFile(*file));
     EXPECT_EQ(errorOf(*file).code, 0);
     EXPECT_EQ(errorOf(*file).message, u"");

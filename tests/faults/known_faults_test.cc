@@ -240,12 +240,12 @@ TEST(KnownFaults, SparseFileBeyondTheMemory) {
     ASSERT_EQ(truncate(sparse.path().c_str(), 10L << 30), 0);
     const MemoryLimit limit(64 * mebibyte);
     auto file = embedded::openFile(sparse.path(), {});
-    EXPECT_EQ(embedded::readLine(*file)->text, u"one");
+    EXPECT_EQ(embedded::readLine(*file)->text(), u"one");
     EXPECT_EQ(file->stream->GetEncodingName(), "UTF-8");
-    EXPECT_EQ(embedded::readLine(*file)->text, u"two");
+    EXPECT_EQ(embedded::readLine(*file)->text(), u"two");
     EXPECT_THROW(embedded::readLine(*file), OutOfMemoryError);
     embedded::rewind(*file);
-    EXPECT_EQ(embedded::readLine(*file, 2)->text, u"on");
+    EXPECT_EQ(embedded::readLine(*file, 2)->text(), u"on");
 }
 
 }  // namespace

@@ -78,6 +78,8 @@ TEST(MemoryBounds, ResultAndLittleMore) {
         {__LINE__, "scan %s", {"y", 12 * mebi * mebi}, 24 * mebi, 16 * mebi},
         {__LINE__, "scan --json %d", {"12345\n", 3 * mebi * mebi}, 24 * mebi, 16 * mebi},
         {__LINE__, "scan --json %s", {"y", 12 * mebi * mebi}, 24 * mebi, 16 * mebi},
+        {__LINE__, "lines", {"y", 12 * mebi * mebi}, 24 * mebi, 16 * mebi},
+        {__LINE__, "lines --json", {"y", 12 * mebi * mebi}, 24 * mebi, 16 * mebi},
 #endif
         {__LINE__, "lines", {line, 300000}, 0, 16 * mebi},
         {__LINE__, "lines --json", {line, 300000}, 0, 16 * mebi},

@@ -249,7 +249,7 @@ void addFiles(std::vector<Scenario>& all) {
                                }
                                OpenFile& file = world.file(mode, encoding, text);
                                while (const auto line = readLine(file, 9, Terminators::Kept)) {
-                                   world.note(nameOf(line->text) + '|');
+                                   world.note(nameOf(line->text()) + '|');
                                    World::check(line->failure);
                                }
                            }});
@@ -274,7 +274,7 @@ void addFiles(std::vector<Scenario>& all) {
              const int number = table.open(content.path(), {});
              const auto line = readLine(table.file(number));
              world.note(table.file(number).stream->GetEncodingName());
-             world.note(line ? vxTextToNarrow(line->text.data(), line->text.size()) : "none");
+             world.note(line ? vxTextToNarrow(line->text().data(), line->text().size()) : "none");
              World::check(table.close(number));
          },
          true});
