@@ -1,17 +1,13 @@
-#include "embedded/services/array.h"
 #include "embedded/services/messages.h"
 #include "fileio/attributes/file_permission.h"
 #include "fileio/attributes/machine_format.h"
 #include "fileio/attributes/precision_string.h"
-#include "fileio/attributes/size_attribute.h"
 #include "tests/properties/properties.h"
 #include "tests/support/raised.h"
 
 #include <cctype>
-#include <cmath>
 #include <cstring>
 #include <string>
-#include <vector>
 
 namespace properties {
 namespace {
@@ -113,49 +109,11 @@ void machineFormat(Bytes& input) {
                  text);
 }
 
-// The size as whole numbers of 128 bits see it.
-std::string expectedSize(const std::vector<double>& values) {
-    constexpr double limit = 281474976710655;
-    const auto whole = [](double value) { return static_cast<__int128>(value); };
-    const auto shown = [](__int128 m, __int128 n, bool isInfinite) {
-        return std::to_string(static_cast<unsigned long>(m)) + 'x' +
-               std::to_string(static_cast<unsigned long>(n)) + (isInfinite ? " infinite" : "");
-    };
-    for (const double value : values) {
-        if (std::isnan(value) || value < 0) return "invalid";
-    }
-    const double first = values[0];
-    if (values.size() == 1)
-        return first > limit ? shown(1, 0, true) : shown(whole(first), first != 0, false);
-    const double second = values[1];
-    if (values.size() > 2 || first > limit) return "invalid";
-    if (second > limit) return shown(whole(first), 0, first != 0);
-    if (first * second > limit) return "invalid";
-    return shown(whole(first), whole(second), false);
-}
-
-void size(Bytes& input) {
-    std::vector<double> values(1 + input.below(3));
-    std::string text;
-    for (double& value : values) {
-        value =
-            input.below(2) == 0 ? input.real() : std::ldexp(1, static_cast<int>(input.below(52)));
-        if (input.below(4) == 0) value -= 0.5;
-        text += std::to_string(value) + ' ';
-    }
-    const embedded::ArrayPtr array = embedded::makeDoubles(1, values.size(), values);
-    const SizeAttribute parsed(array.get());
-    std::string seen = "invalid";
-    if (parsed.IsValid())
-        seen = std::to_string(parsed.m) + 'x' + std::to_string(parsed.n) +
-               (parsed.isInfinite ? " infinite" : "");
-    requireEqual(seen, expectedSize(values), text);
-}
-
 }  // namespace
 
 void attributes(Bytes& input) {
-    constexpr void (*subjects[])(Bytes&) = {precision, precision, permission, machineFormat, size};
+    constexpr void (*subjects[])(Bytes&) = {precision, precision, permission, machineFormat,
+                                            permission};
     input.of(subjects)(input);
 }
 
