@@ -52,7 +52,7 @@ void unpackFields(const FieldRun& run, std::size_t place, unsigned long count, v
 #ifdef FILEIO_VECTOR_UNITS
     if constexpr (sizeof(T) <= sizeof(std::uint32_t)) {
         const unsigned long done =
-            detail::hasAvx2() ? unpackVectors(std::span(run.bytes), place, run.layout, count, out)
+            detail::hasAvx2 ? unpackVectors(std::span(run.bytes), place, run.layout, count, out)
                               : 0;
         place += done * run.stride();
         count -= done;

@@ -46,7 +46,7 @@ FILEIO_FOR_AVX2 void flipOnAvx2(char* elements, std::size_t elementBytes, std::s
 void flipElements(void* elements, std::size_t elementBytes, std::size_t count) {
     auto* const first = static_cast<char*>(elements);
 #ifdef FILEIO_VECTOR_UNITS
-    if (hasAvx2()) return flipOnAvx2(first, elementBytes, count);
+    if (hasAvx2) return flipOnAvx2(first, elementBytes, count);
 #endif
     flip(first, elementBytes, count);
 }

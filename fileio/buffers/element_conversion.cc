@@ -127,8 +127,8 @@ constexpr Runs runsOn = makeRuns<Processor>(std::make_index_sequence<classCount>
 const Runs& runsFor([[maybe_unused]] std::size_t count) {
 #ifdef FILEIO_VECTOR_UNITS
     constexpr std::size_t leastForVectors = 16;
-    if (count >= leastForVectors && detail::hasAvx512()) return runsOn<Avx512Processor>;
-    if (count >= leastForVectors && detail::hasAvx2()) return runsOn<Avx2Processor>;
+    if (count >= leastForVectors && detail::hasAvx512) return runsOn<Avx512Processor>;
+    if (count >= leastForVectors && detail::hasAvx2) return runsOn<Avx2Processor>;
 #endif
     return runsOn<AnyProcessor>;
 }

@@ -19,21 +19,12 @@
 // vectors are wider; which of them runs is decided by the processor at hand.
 namespace Orvandeil::FileIO::detail {
 
-inline bool hasSsse3() {
-    static const bool answer =
-        FILEIO_PROCESSOR_HAS(SSSE3, "ssse3") && FILEIO_PROCESSOR_HAS(POPCNT, "popcnt");
-    return answer;
-}
-inline bool hasAvx2() {
-    static const bool answer = FILEIO_PROCESSOR_HAS(AVX2, "avx2");
-    return answer;
-}
-inline bool hasAvx512() {
-    static const bool answer = FILEIO_PROCESSOR_HAS(AVX512BW, "avx512bw") &&
-                               FILEIO_PROCESSOR_HAS(AVX512DQ, "avx512dq") &&
-                               FILEIO_PROCESSOR_HAS(AVX512VL, "avx512vl");
-    return answer;
-}
+inline const bool hasSsse3 =
+    FILEIO_PROCESSOR_HAS(SSSE3, "ssse3") && FILEIO_PROCESSOR_HAS(POPCNT, "popcnt");
+inline const bool hasAvx2 = FILEIO_PROCESSOR_HAS(AVX2, "avx2");
+inline const bool hasAvx512 = FILEIO_PROCESSOR_HAS(AVX512BW, "avx512bw") &&
+                              FILEIO_PROCESSOR_HAS(AVX512DQ, "avx512dq") &&
+                              FILEIO_PROCESSOR_HAS(AVX512VL, "avx512vl");
 
 }  // namespace Orvandeil::FileIO::detail
 

@@ -56,9 +56,8 @@ struct LineStart {
     int result = 0;
 };
 
-LineStart decodeLine(const detail::UnitsAhead& ahead, std::string_view bytes, char16_t* units,
-                     std::size_t room) {
-    const detail::DirectForm form = ahead.form();
+LineStart decodeLine(const detail::UnitsAhead& ahead, detail::DirectForm form,
+                     std::string_view bytes, char16_t* units, std::size_t room) {
     const Body body = decodeBody(form, bytes, units, room);
     LineStart line = {body.decoded.made, bytes.data() + body.decoded.taken};
     const char* const end = bytes.data() + bytes.size();
@@ -103,8 +102,9 @@ std::size_t fileStream::takeLineAhead(char16_t* units, std::size_t room, int& re
 #ifdef FILEIO_FAST_PATHS
     detail::UnitsAhead ahead(*this);
     const std::string_view bytes = ahead.bytes();
-    if (bytes.empty() || !detail::isAsciiTransparent(ahead.form())) return 0;
-    const LineStart line = decodeLine(ahead, bytes, units, room);
+    const detail::DirectForm form = ahead.form();
+    if (bytes.empty() || !detail::isAsciiTransparent(form)) return 0;
+    const LineStart line = decodeLine(ahead, form, bytes, units, room);
     // The end of what was read ahead may be that of the file, which has to be looked for.
     if (line.result == 0 || line.next == bytes.data() + bytes.size()) return 0;
     ahead.take(bytes.data(), line.next, line.givenBack);
@@ -125,9 +125,10 @@ long fileStream::takeOfLine(long limit, OutputBuffer& out, int& result) {
     std::size_t room = out.getFreeRoom();
     if (limit > 0) room = std::min(room, static_cast<std::size_t>(limit));
     const std::string_view bytes = ahead.bytes();
-    if (room == 0 || bytes.empty() || !detail::isAsciiTransparent(ahead.form())) return 0;
+    const detail::DirectForm form = ahead.form();
+    if (room == 0 || bytes.empty() || !detail::isAsciiTransparent(form)) return 0;
     auto* const units = static_cast<char16_t*>(out.Allocate(room));
-    const LineStart line = decodeLine(ahead, bytes, units, room);
+    const LineStart line = decodeLine(ahead, form, bytes, units, room);
     out.SetLastChunkSize(line.units);
     ahead.take(bytes.data(), line.next, line.givenBack);
     result = line.result;

@@ -171,13 +171,13 @@ FILEIO_FOR_SSSE3 Progress decodeWindows(const char* bytes, std::size_t count, ch
 }  // namespace
 
 Progress decodeMixedUtf8(const char* bytes, std::size_t count, char16_t* out, std::size_t room) {
-    if (!hasSsse3()) return {0, 0};
+    if (!hasSsse3) return {0, 0};
     return decodeWindows<false>(bytes, count, out, room);
 }
 
 Progress decodeMixedUtf8Line(const char* bytes, std::size_t count, char16_t* out,
                              std::size_t room) {
-    if (!hasSsse3()) return {0, 0};
+    if (!hasSsse3) return {0, 0};
     return decodeWindows<true>(bytes, count, out, room);
 }
 

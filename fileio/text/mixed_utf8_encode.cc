@@ -126,7 +126,7 @@ FILEIO_FOR_SSSE3 Progress encodeBlocks(const char16_t* text, std::size_t units, 
 }  // namespace
 
 Progress encodeMixedUtf8(const char16_t* text, std::size_t units, char* out) {
-    if (!hasSsse3()) return {0, 0};
+    if (!hasSsse3) return {0, 0};
     return encodeBlocks(text, units, out);
 }
 
