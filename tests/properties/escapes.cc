@@ -63,7 +63,8 @@ void escapes(Bytes& input) {
                                         "\\xd83d",  "\\\\",  "\\x000", "\\777777777"};
     const std::string format = input.text(parts, 60);
     const Converted wanted = model(format);
-    std::u16string text(format.begin(), format.end());
+    const std::u16string units(format.begin(), format.end());
+    std::u16string text = units, strict = units;
     Orvandeil::FileIO::embedded::WarningRecorder recorder;
     const bool stopped = builtins::util::convertFormatEscSeqs(text, false);
     std::string warning;
@@ -75,6 +76,12 @@ void escapes(Bytes& input) {
     requireEqual(bytesOf(text) + warning, bytesOf(wanted.text) + wanted.warning, format);
     requireEqual(std::to_string(stopped), std::to_string(!warning.empty()), format);
     input.observe(bytesOf(text) + warning);
+    // Only the unknown escape is ever an error, and then the format stays.
+    const bool isUnknown = wanted.warning.starts_with("Bad");
+    const std::string raised =
+        fileio_tests::raisedBy([&] { builtins::util::convertFormatEscSeqs(strict, true); });
+    requireEqual(raised, isUnknown ? "KESTRA:printf:" + warning : "", format + " strictly");
+    requireEqual(bytesOf(strict), bytesOf(isUnknown ? units : text), format + " strictly");
     if (text.find(u'\\') != text.npos) return;
     const std::u16string once = text;
     builtins::util::convertFormatEscSeqs(text, true);

@@ -30,19 +30,6 @@ std::string readRest(std::FILE* file) {
     return rest;
 }
 
-// A file in memory behind a small buffer, able to seek or like a pipe.
-struct EdgeFile {
-    EdgeFile(const std::string& text, bool canSeek, std::size_t bufferSize)
-        : memory{.bytes = text, .failingSeek = canSeek ? 0 : 1, .error = ESPIPE},
-          file(memory.open("r", bufferSize)) {}
-    EdgeFile(const EdgeFile&) = delete;
-    EdgeFile& operator=(const EdgeFile&) = delete;
-    ~EdgeFile() { std::fclose(file); }
-
-    support::FaultyFile memory;
-    std::FILE* file;
-};
-
 bool isBlank(char byte) {
     return byte == '\0' ||
            qzu_isbreakablespace(static_cast<char16_t>(static_cast<signed char>(byte)));
@@ -97,9 +84,11 @@ void fileFields(Bytes& input) {
     const std::size_t bufferSize = input.below(2) == 0 ? 1 + input.below(40) : 4096;
     std::size_t steps = 1 + input.below(4);
     const std::string text = fields.text(1 + input.below(12));
-    const EdgeFile first(text, canSeek, bufferSize), second(text, canSeek, bufferSize);
-    Orvandeil::FileIO::FilePermission permission;
-    Orvandeil::FileIO::fileStream stream(first.file, "", permission, u"");
+    support::FaultyFile one{.bytes = text, .failingSeek = canSeek ? 0 : 1, .error = ESPIPE};
+    support::FaultyFile two = one;
+    support::OpenedFile first(one.open("r", bufferSize), "r"),
+        second(two.open("r", bufferSize), "r");
+    Orvandeil::FileIO::fileStream& stream = first.stream;
     int errorCode = 0;
     for (; steps > 0; --steps) {
         const Operation operation = fields.operation();

@@ -28,6 +28,7 @@ namespace {
 using namespace Orvandeil::FileIO;
 using namespace Orvandeil::FileIO::embedded;
 using Arguments = std::vector<const vxArray*>;
+using support::Unknown;
 
 constexpr vxClassID classes[] = {vxDOUBLE_CLASS, vxDOUBLE_CLASS, vxSINGLE_CLASS, vxINT8_CLASS,
                                  vxINT16_CLASS,  vxINT32_CLASS,  vxINT64_CLASS,  vxUINT8_CLASS,
@@ -205,23 +206,14 @@ std::string printToFile(const std::string& encoding, const std::u16string& forma
                         const Arguments& arguments, const Failures& failures = {}) {
     support::FaultyFile memory{
         .bytes = "", .failingWrite = failures.write, .error = failures.error};
-    std::FILE* const file = memory.open("w", failures.bufferSize);
-    FilePermission permission("w", false);
     std::string end;
     {
-        Stream out(file, encoding, permission, u"");
-        end = print(out, format, arguments) + " wrote " + std::to_string(out.getBytesWritten());
+        support::StreamOver<Stream> out(memory.open("w", failures.bufferSize), "w", encoding);
+        end = print(out.stream, format, arguments) + " wrote " +
+              std::to_string(out.stream.getBytesWritten());
     }
-    std::fclose(file);
     return memory.bytes + end;
 }
-
-struct UnknownStringStream : outputStringStream {
-    using outputStringStream::outputStringStream;
-};
-struct UnknownFileStream : fileStream {
-    using fileStream::fileStream;
-};
 
 ArrayPtr anyArgument(Bytes& input, bool areWidths) {
     static const std::string parts[] = {"a", "é", "€", "\xF0\x9F\x98\x80", "%d", ""};
@@ -284,13 +276,13 @@ void withFailures(Bytes& input, std::string text, const std::string& encoding,
     const std::u16string format =
         fileio_tests::toUtf16(text + std::string(input.below(4) == 0 ? input.below(400) : 0, '*'));
     requireEqual(printToString<outputStringStream>(encoding, format, arguments, failures),
-                 printToString<UnknownStringStream>(encoding, format, arguments, failures),
+                 printToString<Unknown<outputStringStream>>(encoding, format, arguments, failures),
                  text + " with failing memory");
     // Padding of text is written in blocks, of which a failing file counts all or nothing.
     if (text.find_first_of("sc") == text.npos) failures.write = static_cast<int>(input.below(6));
     failures.error = failures.write % 2 == 0 ? ENOSPC : 0;
     requireEqual(printToFile<fileStream>(encoding, format, arguments, failures),
-                 printToFile<UnknownFileStream>(encoding, format, arguments, failures),
+                 printToFile<Unknown<fileStream>>(encoding, format, arguments, failures),
                  text + " to a full disk");
 }
 
@@ -309,11 +301,12 @@ void againstUnknownStreams(Bytes& input) {
     const Arguments arguments = listed(owned, text.size() % 3 == 0 ? 9 : 1);
     const std::u16string format = fileio_tests::toUtf16(text);
     const std::string seen = printToString<outputStringStream>(encoding, format, arguments);
-    requireEqual(seen, printToString<UnknownStringStream>(encoding, format, arguments), text);
+    requireEqual(seen, printToString<Unknown<outputStringStream>>(encoding, format, arguments),
+                 text);
     input.observe(seen);
     if (!encoding.empty())
         requireEqual(printToFile<fileStream>(encoding, format, arguments),
-                     printToFile<UnknownFileStream>(encoding, format, arguments),
+                     printToFile<Unknown<fileStream>>(encoding, format, arguments),
                      text + " to a file");
     if (!input.empty()) withFailures(input, text, encoding, owned);
 }

@@ -17,13 +17,7 @@ namespace {
 using namespace Orvandeil::FileIO;
 using namespace std::string_literals;
 using support::Scanned;
-
-struct UnknownStringStream : inputStringStream {
-    using inputStringStream::inputStringStream;
-};
-struct UnknownFileStream : fileStream {
-    using fileStream::fileStream;
-};
+using support::Unknown;
 
 constexpr const char* encodings[] = {"UTF-8", "", "ISO-8859-1", "UTF-16LE", "Shift_JIS", "UTF-8"};
 
@@ -78,17 +72,11 @@ template <class Stream>
 std::string scanFile(const std::string& text, const std::string& encoding,
                      const std::string& format, const Way& way) {
     support::FaultyFile memory{.bytes = text, .failingSeek = way.canSeek ? 0 : 1, .error = ESPIPE};
-    std::FILE* const file = memory.open("r", way.readAhead);
-    FilePermission permission;
-    std::string seen;
-    {
-        Stream stream(file, encoding.empty() ? "UTF-8" : encoding, permission, u"");
-        const Scanned scanned = support::scan(stream, format, way.limit, way.chunk);
-        if (way.readsOn) seen = readOn(stream, format);
-        seen += finish(stream, scanned, way);
-    }
-    std::fclose(file);
-    return seen;
+    support::StreamOver<Stream> opened(memory.open("r", way.readAhead), "r",
+                                       encoding.empty() ? "UTF-8" : encoding);
+    const Scanned scanned = support::scan(opened.stream, format, way.limit, way.chunk);
+    const std::string seen = way.readsOn ? readOn(opened.stream, format) : "";
+    return seen + finish(opened.stream, scanned, way);
 }
 
 // By streams that the library knows, which must do what the same streams do that it does not know.
@@ -96,9 +84,9 @@ std::string scanBoth(const std::string& text, const std::string& encoding,
                      const std::string& format, const Way& way) {
     const std::string where = format + " over " + text + " in " + encoding;
     const std::string seen = scanText<inputStringStream>(text, encoding, format, way);
-    requireEqual(seen, scanText<UnknownStringStream>(text, encoding, format, way), where);
+    requireEqual(seen, scanText<Unknown<inputStringStream>>(text, encoding, format, way), where);
     const std::string inFile = scanFile<fileStream>(text, encoding, format, way);
-    requireEqual(inFile, scanFile<UnknownFileStream>(text, encoding, format, way),
+    requireEqual(inFile, scanFile<Unknown<fileStream>>(text, encoding, format, way),
                  where + " in a file");
     return seen + inFile;
 }

@@ -88,12 +88,9 @@ std::string MemoryFile::content() const {
 }
 
 OpenedFile::OpenedFile(const std::string& path, const char* mode, const std::string& encoding)
-    : permission(mode, false),
-      file(std::fopen(path.c_str(), permission.fileSystemFormat)),
-      stream(file, encoding, permission, fileio_tests::toUtf16(path)) {}
-
-OpenedFile::OpenedFile(std::FILE* openFile, const char* mode, const std::string& encoding)
-    : permission(mode, false), file(openFile), stream(file, encoding, permission, u"") {}
+    : StreamOver(
+          std::fopen(path.c_str(), Orvandeil::FileIO::FilePermission(mode, false).fileSystemFormat),
+          mode, encoding, fileio_tests::toUtf16(path)) {}
 
 std::string OpenedFile::read(unsigned long count) {
     std::string bytes;

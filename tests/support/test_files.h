@@ -40,21 +40,33 @@ private:
     int descriptor;
 };
 
-// A file opened by path and permission, and the stream over it.
-struct OpenedFile {
+// A stream of a class that the library does not know, so that it is used in the plainest way.
+template <class Stream>
+struct Unknown : Stream {
+    using Stream::Stream;
+};
+
+// A stream over a file, which it takes over.
+template <class Stream>
+struct StreamOver {
+    StreamOver(std::FILE* openFile, const char* mode, const std::string& encoding = "",
+               const std::u16string& name = u"")
+        : permission(mode, false), file(openFile), stream(file, encoding, permission, name) {}
+    ~StreamOver() { std::fclose(file); }
+
+    Orvandeil::FileIO::FilePermission permission;
+    std::FILE* file;
+    Stream stream;
+};
+
+struct OpenedFile : StreamOver<Orvandeil::FileIO::fileStream> {
+    using StreamOver::StreamOver;
     explicit OpenedFile(const std::string& path, const char* mode = "r",
                         const std::string& encoding = "");
-    // Takes over a file opened in another way.
-    OpenedFile(std::FILE* openFile, const char* mode, const std::string& encoding = "");
-    ~OpenedFile() { std::fclose(file); }
 
     // Reads up to `count` bytes one by one.
     std::string read(unsigned long count);
     long position();
-
-    Orvandeil::FileIO::FilePermission permission;
-    std::FILE* file;
-    Orvandeil::FileIO::fileStream stream;
 };
 
 // What a program asks of the system and of its host.
