@@ -38,67 +38,69 @@ constexpr std::array<unsigned char, 128> characterSets = makeCharacterSets();
 // Takes parts off the front of a text.
 class Taker {
 public:
-    explicit Taker(std::u16string_view format) : rest(format) {}
+    Taker(const char16_t* from, const char16_t* to) : next(from), end(to) {}
 
-    std::u16string_view takeLength(std::size_t length) {
-        const std::u16string_view taken = rest.substr(0, length);
-        rest.remove_prefix(taken.size());
-        return taken;
+    const char16_t* place() const { return next; }
+    bool isAtLetter() const { return isAt(next, ConversionLetter); }
+
+    std::u16string_view takeAll(CharacterSet set) { return takeTo(endOfRun(set, next)); }
+    std::u16string_view takeOne(CharacterSet set) {
+        return takeTo(next + (isAt(next, set) ? 1 : 0));
     }
-    std::u16string_view takeAll(CharacterSet set) { return takeLength(runOf(set, 0)); }
-    std::u16string_view takeOne(CharacterSet set) { return takeLength(isAt(0, set) ? 1 : 0); }
 
-    std::u16string_view takeNumbered() { return takeLength(numberedLength(0)); }
+    std::u16string_view takeNumbered() { return takeTo(endOfNumbered(next)); }
     std::u16string_view takeWidth() {
-        if (isAt(0, Star)) return takeLength(1 + numberedLength(1));
-        return isAt(0, LeadingDigit) ? takeAll(Digit) : std::u16string_view();
+        if (isAt(next, Star)) return takeTo(endOfNumbered(next + 1));
+        return takeTo(isAt(next, LeadingDigit) ? endOfRun(Digit, next) : next);
     }
     std::u16string_view takePrecision() {
-        if (!isAt(0, Point)) return {};
-        if (isAt(1, Star)) return takeLength(2 + numberedLength(2));
-        const std::size_t sign = isAt(1, Sign) ? 1 : 0;
-        return takeLength(1 + sign + runOf(Digit, 1 + sign));
+        if (!isAt(next, Point)) return {};
+        if (isAt(next + 1, Star)) return takeTo(endOfNumbered(next + 2));
+        return takeTo(endOfRun(Digit, next + (isAt(next + 1, Sign) ? 2 : 1)));
     }
 
 private:
-    bool isAt(std::size_t offset, CharacterSet set) const {
-        return offset < rest.size() && rest[offset] < characterSets.size() &&
-               (characterSets[rest[offset]] & set) != 0;
+    bool isAt(const char16_t* at, CharacterSet set) const {
+        return at != end && *at < characterSets.size() && (characterSets[*at] & set) != 0;
     }
-    std::size_t runOf(CharacterSet set, std::size_t offset) const {
-        std::size_t end = offset;
-        while (isAt(end, set))
-            ++end;
-        return end - offset;
+    const char16_t* endOfRun(CharacterSet set, const char16_t* at) const {
+        while (isAt(at, set))
+            ++at;
+        return at;
     }
-    // The length of "digits$" at the offset; without the "$" it is no reference at all.
-    std::size_t numberedLength(std::size_t offset) const {
-        if (!isAt(offset, LeadingDigit)) return 0;
-        const std::size_t run = runOf(Digit, offset);
-        return offset + run < rest.size() && rest[offset + run] == u'$' ? run + 1 : 0;
+    // The end of "digits$"; without the "$" it is no reference at all.
+    const char16_t* endOfNumbered(const char16_t* at) const {
+        if (!isAt(at, LeadingDigit)) return at;
+        const char16_t* const run = endOfRun(Digit, at);
+        return run != end && *run == u'$' ? run + 1 : at;
+    }
+    std::u16string_view takeTo(const char16_t* to) {
+        const std::u16string_view taken(next, static_cast<std::size_t>(to - next));
+        next = to;
+        return taken;
     }
 
-    std::u16string_view rest;
+    const char16_t* next;
+    const char16_t* const end;
 };
 
 }  // namespace
 
 ConversionToken tokenizeConversion(std::u16string_view format, std::size_t position) {
-    ConversionToken token;
-    Taker taker(format.substr(position));
-    std::size_t length = taker.takeLength(1).size();
-    const auto count = [&length](std::u16string_view part) {
-        length += part.size();
-        return part;
-    };
-    token.numbered = count(taker.takeNumbered());
-    token.flags = count(taker.takeAll(Flag));
-    token.width = count(taker.takeWidth());
-    token.precision = count(taker.takePrecision());
-    token.modifier = count(taker.takeOne(Modifier));
-    token.conversion = count(taker.takeOne(ConversionLetter));
-    token.whole = format.substr(position, length);
-    return token;
+    const char16_t* const begin = format.data() + position;
+    Taker taker(begin + 1, format.data() + format.size());
+    // The parts in their order, of which most conversions have the last alone.
+    std::u16string_view numbered, flags, width, precision, modifier;
+    if (!taker.isAtLetter()) {
+        numbered = taker.takeNumbered();
+        flags = taker.takeAll(Flag);
+        width = taker.takeWidth();
+        precision = taker.takePrecision();
+        modifier = taker.takeOne(Modifier);
+    }
+    const std::u16string_view conversion = taker.takeOne(ConversionLetter);
+    const std::u16string_view whole(begin, static_cast<std::size_t>(taker.place() - begin));
+    return {whole, numbered, flags, width, precision, modifier, conversion};
 }
 
 }  // namespace Orvandeil::FileIO::detail

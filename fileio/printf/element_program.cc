@@ -182,7 +182,7 @@ void ElementProgram::run(printfArgumentSource& source, foutFormatPiece*& current
                 runAs<long>(source, asClass, passes * steps.size());
         }
     } catch (...) {
-        current = pieces[failedPiece].get();
+        current = pieces[failedPiece];
         throw;
     }
 }

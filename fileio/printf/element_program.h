@@ -7,7 +7,6 @@
 #include "fileio/text/ascii_output.h"
 
 #include <array>
-#include <memory>
 #include <span>
 #include <string>
 #include <vector>
@@ -18,7 +17,7 @@ namespace Orvandeil::FileIO::detail {
 // argument without asking anything again for each of them. It prints what the pieces would print.
 class ElementProgram {
 public:
-    using Pieces = std::span<const std::unique_ptr<foutFormatPiece>>;
+    using Pieces = std::span<foutFormatPiece* const>;
 
     // The first pass of the format is over, so that the stream's encoding is decided.
     ElementProgram(Pieces formatPieces, TcodnStream& out);

@@ -17,10 +17,6 @@ double takeNumber(printfArgumentSource* source, int emptyArgumentCode) {
 
 }  // namespace
 
-FormatField::FormatField(const FieldValidator& fieldValidator, WidthPrecisionFieldType fieldKind,
-                         int formatValue)
-    : validator(&fieldValidator), kind(fieldKind), value(formatValue), effective(formatValue) {}
-
 void FormatField::setup(printfArgumentSource* source) {
     if (!isFromArgument()) return;
     if (kind == FieldNumberedArgument) source->setCurrentArgument(static_cast<std::size_t>(value));

@@ -12,7 +12,8 @@ class printfArgumentSource;
 class FILEIO_API FormatField {
 public:
     FormatField(const FieldValidator& fieldValidator, WidthPrecisionFieldType fieldKind,
-                int formatValue);
+                int formatValue)
+        : validator(&fieldValidator), kind(fieldKind), value(formatValue), effective(formatValue) {}
 
     // Takes the value from an argument where the format says so. Throws, as int, the codes of
     // the source and of the validator.

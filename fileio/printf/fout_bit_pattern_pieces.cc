@@ -104,7 +104,7 @@ unsigned long foutFormatPieceForUbt<U, F>::formatBitPattern(U bits, char* digits
 
 template <class U, class F>
 foutFormatPieceForXbt<U, F>::foutFormatPieceForXbt(const foutFormatPieceInitBlock& init)
-    : foutFormatPieceForOUXbt<U, F>(init), upperCase(init.printfFormat.ends_with('X')) {}
+    : foutFormatPieceForOUXbt<U, F>(init), upperCase(init.written.ends_with(u'X')) {}
 
 template <class U, class F>
 unsigned long foutFormatPieceForXbt<U, F>::formatBitPattern(U bits, char* digits) const {

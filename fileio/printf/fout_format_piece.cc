@@ -2,6 +2,7 @@
 
 #include "fileio/constants.h"
 #include "fileio/errors/code_list.h"
+#include "fileio/printf/conversion_token.h"
 #include "fileio/printf/long_precision.h"
 #include "fileio/printf/number_text.h"
 #include "fileio/printf/printf_argument_source.h"
@@ -23,6 +24,29 @@ static_assert(code::BadWidthNaN == -15 && code::BadWidthEmptyArg == -19 &&
 // The digits before the point: 309 for the largest double, 22 for 64 bits in octal; one for a sign.
 template <class T>
 constexpr unsigned long integerDigits = std::is_floating_point_v<T> ? 310 : 23;
+
+// The text for the C library: without argument numbers, and in the one size of whole numbers.
+std::string printfTextOf(const foutFormatPieceInitBlock& init) {
+    const detail::ConversionToken token = detail::tokenizeConversion(init.written, 0);
+    std::string text = "%";
+    const auto append = [&text](std::u16string_view part) {
+        for (const char16_t unit : part)
+            text += static_cast<char>(unit);
+    };
+    if (init.forceSign && token.flags.find(u'+') == token.flags.npos) text += '+';
+    append(token.flags);
+    // A written width may have digits that the value cannot hold: printf refuses it itself.
+    if (init.widthKind != FieldAbsent) append(init.widthKind == FieldLiteral ? token.width : u"*");
+    if (init.precisionKind == FieldLiteral) {
+        // ".-" and ".-0" say precision 0, in a form that printf does not know.
+        append(token.precision.find(u'-') == token.precision.npos ? token.precision : u".");
+    } else if (init.precisionKind != FieldAbsent) {
+        append(u".*");
+    }
+    if (init.conversion <= ConvX) append(u"ll");
+    append(token.conversion);
+    return text;
+}
 
 std::string exponentForm(const std::string& text) {
     return text.substr(0, text.find_last_not_of("hlbtdiouxXeEfgGsc") + 1) + 'e';
@@ -59,9 +83,10 @@ foutFormatPiece::foutFormatPiece(const foutFormatPieceInitBlock& init)
       precision(precisionValidator, init.precisionKind, init.precision),
       formatPosition(init.formatPosition),
       conversion(init.conversion),
-      subformat(init.subformat),
-      parsedText(init.printfFormat) {
-    if (conversion != NoConversion) variants[AsParsed] = &parsedText;
+      subformat(init.subformat) {
+    if (conversion == NoConversion) return;
+    parsedText = printfTextOf(init);
+    variants[AsParsed] = &parsedText;
 }
 
 foutFormatPiece::~foutFormatPiece() {
@@ -73,14 +98,9 @@ unsigned long foutFormatPiece::getBufferSize() const {
     return static_cast<unsigned long>(precision.getEffective() + width.getEffective() + 20);
 }
 
-void foutFormatPiece::setup(printfArgumentSource* source) {
+void foutFormatPiece::setupFields(printfArgumentSource* source) {
     width.setup(source);
     precision.setup(source);
-    chooseVariant();
-}
-
-void foutFormatPiece::chooseVariant() {
-    variant = AsParsed;
     if (precision.isNegative()) useVariant(NoPrecision, withoutArgumentPrecision);
 }
 

@@ -2,32 +2,36 @@
 
 #include "fileio/export.h"
 #include "fileio/memory_operation_overloads.h"
+#include "fileio/piece_list.h"
 #include "fileio/printf/format_field.h"
 #include "fileio/printf/printability.h"
 #include "fileio/printf/vocabulary.h"
 
-#include <memory>
 #include <string>
 #include <string_view>
 
 namespace Orvandeil::FileIO {
 
 class TcodnStream;
+class foutFormatPiece;
 class printfArgumentSource;
+
+using foutFormatPieceList = detail::PieceList<foutFormatPiece, 1536>;
 
 // What the parser found out about one piece.
 struct foutFormatPieceInitBlock {
-    std::string printfFormat;  // for the C library; empty for a literal
     unsigned long numberedIndex = 0;
     PrintFormatFlags flags = NoFlags;
-    WidthPrecisionFieldType widthKind = FieldAbsent;
     int width = 0;
-    WidthPrecisionFieldType precisionKind = FieldAbsent;
+    WidthPrecisionFieldType widthKind = FieldAbsent;
     int precision = 0;
-    bool forceSign = false;
-    unsigned long formatPosition = 0;
-    PrintfFormat conversion = NoConversion;
+    WidthPrecisionFieldType precisionKind = FieldAbsent;
     PrintfSubformat subformat = NoSubformat;
+    PrintfFormat conversion = NoConversion;
+    bool forceSign = false;
+    // A literal, or a conversion from its "%" to its letter; outlives the piece.
+    std::u16string_view written = {};
+    unsigned long formatPosition = 0;
 };
 
 // One piece of an output format. Printing takes width and precision from the arguments where the
@@ -41,12 +45,9 @@ public:
     foutFormatPiece& operator=(const foutFormatPiece&) = delete;
     virtual ~foutFormatPiece();
 
-    // `subformatText` is the printf text of a conversion, or the text of a literal.
-    static std::unique_ptr<foutFormatPiece> createFoutFormatPiece(
-        PrintfFormat conversion, PrintfSubformat subformat, unsigned long numberedIndex,
-        PrintFormatFlags flags, WidthPrecisionFieldType widthKind, int width,
-        WidthPrecisionFieldType precisionKind, int precision, const std::u16string& subformatText,
-        bool forceSign, unsigned long formatPosition);
+    // Adds a new piece to the list.
+    static void createFoutFormatPiece(foutFormatPieceList& pieces,
+                                      const foutFormatPieceInitBlock& init);
 
     virtual bool consumesData() const { return true; }
     virtual bool isUnsigned() const { return false; }
@@ -61,7 +62,10 @@ public:
         setup(source);
         print(out, source);
     }
-    void setup(printfArgumentSource* source);
+    void setup(printfArgumentSource* source) {
+        variant = AsParsed;
+        if (width.isFromArgument() || precision.isFromArgument()) setupFields(source);
+    }
     void print(TcodnStream* out, printfArgumentSource* source);
 
     PrintfFormat getConversion() const { return conversion; }
@@ -103,7 +107,7 @@ private:
     enum Variant : int { AsParsed = 0, Exponent = 1, NoPrecision = 2, ExponentNoPrecision = 3 };
     static constexpr int variantCount = 4;
 
-    void chooseVariant();
+    void setupFields(printfArgumentSource* source);
     const char* nonFiniteText(double value) const;
     void useVariant(Variant wanted, std::string (*build)(const std::string&));
     template <class T>

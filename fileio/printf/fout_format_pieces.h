@@ -3,7 +3,6 @@
 #include "fileio/printf/fout_format_piece.h"
 
 #include <cstddef>
-#include <memory>
 #include <string>
 #include <string_view>
 
@@ -12,7 +11,7 @@ namespace Orvandeil::FileIO {
 // A run of text between conversions, and "%%".
 class FILEIO_API foutFormatPieceForLiterals : public foutFormatPiece {
 public:
-    foutFormatPieceForLiterals(const foutFormatPieceInitBlock& init, std::u16string literalText);
+    explicit foutFormatPieceForLiterals(const foutFormatPieceInitBlock& init);
 
     bool consumesData() const override { return false; }
     void printByType(TcodnStream* out, printfArgumentSource* source) override;
@@ -22,7 +21,7 @@ public:
     std::u16string_view getText() const { return text; }
 
 private:
-    std::u16string text;
+    std::u16string_view text;  // of the format, which outlives the piece
 };
 
 // The text of a literal piece; empty for a conversion.

@@ -7,9 +7,8 @@
 
 namespace Orvandeil::FileIO {
 
-foutFormatPieceForLiterals::foutFormatPieceForLiterals(const foutFormatPieceInitBlock& init,
-                                                       std::u16string literalText)
-    : foutFormatPiece(init), text(std::move(literalText)) {}
+foutFormatPieceForLiterals::foutFormatPieceForLiterals(const foutFormatPieceInitBlock& init)
+    : foutFormatPiece(init), text(init.written) {}
 
 void foutFormatPieceForLiterals::printByType(TcodnStream* out, printfArgumentSource*) {
     if (out->needsBufferSize()) out->setBufferSize(getBufferSize());
@@ -21,8 +20,8 @@ Printability foutFormatPieceForLiterals::decidePrintMode(printfArgumentSource*) 
 }
 
 std::u16string_view literalTextOf(const foutFormatPiece& piece) {
-    const auto* literal = dynamic_cast<const foutFormatPieceForLiterals*>(&piece);
-    return literal == nullptr ? std::u16string_view() : literal->getText();
+    if (piece.getConversion() != NoConversion) return {};
+    return static_cast<const foutFormatPieceForLiterals&>(piece).getText();
 }
 
 void foutFormatPieceForS::printByType(TcodnStream* out, printfArgumentSource* source) {

@@ -27,9 +27,9 @@ constexpr double largestMagnitude = std::numeric_limits<double>::infinity();
 
 // Below it, a value with so many decimals has sixteen digits at most.
 double plainLimitOf(int precision) {
-    constexpr double limits[] = {9.99e15, 9.99e14, 9.99e13, 9.99e12, 9.99e11, 9.99e10,
-                                 9.99e9,  9.99e8,  9.99e7,  9.99e6,  9.99e5,  9.99e4,
-                                 9.99e3,  9.99e2,  9.99e1,  9.99};
+    static constexpr double limits[] = {9.99e15, 9.99e14, 9.99e13, 9.99e12, 9.99e11, 9.99e10,
+                                        9.99e9,  9.99e8,  9.99e7,  9.99e6,  9.99e5,  9.99e4,
+                                        9.99e3,  9.99e2,  9.99e1,  9.99};
     return precision < static_cast<int>(std::size(limits)) ? limits[precision] : 0;
 }
 

@@ -6,6 +6,7 @@
 #include "fileio/text/tcodn_stream.h"
 
 #include <algorithm>
+#include <array>
 #include <stdexcept>
 
 namespace Orvandeil::FileIO {
@@ -31,30 +32,35 @@ PrintfSubformat modifierOf(std::u16string_view modifier) {
 }
 
 struct Conversion {
-    char16_t letter;
-    PrintfFormat kind;
-    PrintfSubformat lastModifier;  // of those that it allows, in the order of their numbers
-
-    bool isInteger() const { return lastModifier != NoSubformat; }
+    PrintfFormat kind = NoConversion;
+    PrintfSubformat lastModifier = NoSubformat;  // of those that it allows, in numerical order
 };
 
-constexpr Conversion conversions[] = {
-    {u'd', ConvD, SubL},        {u'i', ConvI, SubL},        {u'o', ConvO, SubB},
-    {u'u', ConvU, SubB},        {u'x', ConvX, SubB},        {u'X', ConvX, SubB},
-    {u'e', ConvE, NoSubformat}, {u'E', ConvE, NoSubformat}, {u'f', ConvF, NoSubformat},
-    {u'g', ConvG, NoSubformat}, {u'G', ConvG, NoSubformat}, {u's', ConvS, NoSubformat},
-    {u'c', ConvC, NoSubformat},
-};
-
-const Conversion& conversionOf(char16_t letter) {
-    return *std::ranges::find(conversions, letter, &Conversion::letter);
+// By letter.
+constexpr std::array<Conversion, 128> makeConversions() {
+    std::array<Conversion, 128> all{};
+    const auto add = [&all](std::string_view letters, PrintfFormat kind, PrintfSubformat last) {
+        for (const char letter : letters)
+            all[static_cast<std::size_t>(letter)] = {kind, last};
+    };
+    add("d", ConvD, SubL);
+    add("i", ConvI, SubL);
+    add("o", ConvO, SubB);
+    add("u", ConvU, SubB);
+    add("xX", ConvX, SubB);
+    add("eE", ConvE, NoSubformat);
+    add("f", ConvF, NoSubformat);
+    add("gG", ConvG, NoSubformat);
+    add("s", ConvS, NoSubformat);
+    add("c", ConvC, NoSubformat);
+    return all;
 }
+constexpr std::array<Conversion, 128> conversions = makeConversions();
 
 }  // namespace
 
 PrintFormatParser::PrintFormatParser(std::u16string format, bool signForced)
     : formatText(std::move(format)), formatCharacters(formatText.c_str()), forceSign(signForced) {
-    pieces.reserve(16);
     if (formatText.empty()) {
         recordInvalidFormat();
     } else {
@@ -65,9 +71,15 @@ PrintFormatParser::PrintFormatParser(std::u16string format, bool signForced)
 PrintFormatParser::~PrintFormatParser() = default;
 
 foutFormatPiece* PrintFormatParser::getNextPrintFormatPiece() {
-    if (nextPiece < pieces.size()) return pieces[nextPiece++].get();
+    if (nextPiece < blocks.size()) return getPieces()[nextPiece++];
     if (recordedError != 0) throw recordedError;
     return nullptr;
+}
+
+std::span<foutFormatPiece* const> PrintFormatParser::getPieces() {
+    while (pieces.size() < blocks.size())
+        foutFormatPiece::createFoutFormatPiece(pieces, blocks[pieces.size()]);
+    return pieces.all();
 }
 
 void PrintFormatParser::resetParser() {
@@ -82,7 +94,7 @@ bool PrintFormatParser::trailingWhitespaceIsLeftJustification() const {
 
 void PrintFormatParser::printRemainingFormatAsLiteral(TcodnStream* out) const {
     if (nextPiece == 0) throw std::out_of_range("no piece of the format was taken yet");
-    const unsigned long position = pieces[nextPiece - 1]->getFormatPosition();
+    const unsigned long position = blocks[nextPiece - 1].formatPosition;
     const std::u16string rest = formatText.substr(position);
     if (out->PutString(rest) < rest.size()) throw out->getErrorCode();
 }
@@ -97,16 +109,20 @@ void PrintFormatParser::parse() {
             return;
         }
         if (position < percent) pushLiteral(position, percent, percent);
-        parseConversion(percent);
+        position = parseConversion(percent);
         if (recordedError != 0) return;
-        position = percent + match.whole.size();
     }
 }
 
-void PrintFormatParser::parseConversion(std::size_t position) {
-    match = detail::tokenizeConversion(formatText, position);
-    subformatText += u'%';
-    if (!specialCasePercent()) {
+// Returns the place behind it.
+std::size_t PrintFormatParser::parseConversion(std::size_t position) {
+    const detail::ConversionToken token = detail::tokenizeConversion(formatText, position);
+    beginPiece(position);
+    match = &token;
+    if (specialCasePercent()) {
+        piece->written = token.conversion;
+    } else {
+        piece->written = token.whole;
         extractNumberedArgPart();
         extractFlagsPart();
         extractWidthPart();
@@ -115,74 +131,65 @@ void PrintFormatParser::parseConversion(std::size_t position) {
         extractFormatPart();
         ++conversionCount;
     }
-    if (recordedError == 0) pushFormat(position);
+    match = nullptr;
+    if (recordedError != 0) blocks.pop_back();
+    return position + token.whole.size();
 }
 
 // True when nothing is left to extract: "%%", and what is no conversion at all.
 bool PrintFormatParser::specialCasePercent() {
-    if (match.conversion.empty()) {
+    if (match->conversion.empty()) {
         recordInvalidFormat();
         return true;
     }
-    if (match.conversion != u"%") return false;
-    if (match.whole.size() != 2) recordInvalidFormat();
+    if (match->conversion != u"%") return false;
+    if (match->whole.size() != 2) recordInvalidFormat();
     return true;
 }
 
 void PrintFormatParser::extractNumberedArgPart() {
-    if (match.numbered.empty()) {
+    if (match->numbered.empty()) {
         setArgumentType(ArgumentsSequential);
         return;
     }
     setArgumentType(ArgumentsNumbered);
-    numberedIndex = static_cast<unsigned int>(decimalAt(match.numbered));
+    piece->numberedIndex = static_cast<unsigned long>(decimalAt(match->numbered));
 }
 
 void PrintFormatParser::extractFlagsPart() {
-    for (const char16_t character : match.flags) {
+    for (const char16_t character : match->flags) {
         const PrintFormatFlags flag = flagOf(character);
-        if (flags & flag) {
+        if (piece->flags & flag) {
             recordInvalidFormat();
             return;
         }
-        flags = flags | flag;
+        piece->flags = piece->flags | flag;
     }
-    lastLeftJustified = flags & LeftJustify;
-    if (forceSign && !(flags & ShowSign)) {
-        subformatText += u'+';
-        flags = flags | ShowSign;
-    }
-    subformatText += match.flags;
+    lastLeftJustified = piece->flags & LeftJustify;
+    if (forceSign) piece->flags = piece->flags | ShowSign;
 }
 
 void PrintFormatParser::extractWidthPart() {
-    if (forceSign || match.width.empty()) return;
-    if (match.width.front() == u'*') {
-        widthKind = extractReference(match.width.substr(1), widthValue);
-        subformatText += u'*';
+    if (forceSign || match->width.empty()) return;
+    if (match->width.front() == u'*') {
+        piece->widthKind = extractReference(match->width.substr(1), piece->width);
     } else {
-        // The text keeps digits that the value cannot hold: printf refuses such a width itself.
-        widthKind = FieldLiteral;
-        widthValue = decimalAt(match.width);
-        subformatText += match.width;
+        piece->widthKind = FieldLiteral;
+        piece->width = decimalAt(match->width);
     }
 }
 
 void PrintFormatParser::extractPrecisionPart() {
-    if (match.precision.empty()) return;
-    const std::u16string_view digits = match.precision.substr(1);
+    if (match->precision.empty()) return;
+    const std::u16string_view digits = match->precision.substr(1);
     if (!digits.empty() && digits.front() == u'*') {
-        precisionKind = extractReference(digits.substr(1), precisionValue);
-        subformatText += u".*";
+        piece->precisionKind = extractReference(digits.substr(1), piece->precision);
         return;
     }
     const int value = decimalAt(digits);
     if (value < 0) return;
-    precisionKind = FieldLiteral;
-    precisionValue = value;
-    // ".-" and ".-0" say precision 0, in a form that printf does not know.
-    const bool hasSign = !digits.empty() && digits.front() == u'-';
-    subformatText += hasSign ? std::u16string_view(u".") : match.precision;
+    piece->precisionKind = FieldLiteral;
+    piece->precision = value;
 }
 
 WidthPrecisionFieldType PrintFormatParser::extractReference(std::u16string_view digits,
@@ -198,18 +205,15 @@ WidthPrecisionFieldType PrintFormatParser::extractReference(std::u16string_view 
 }
 
 void PrintFormatParser::extractSubFormatPart() {
-    subformat = modifierOf(match.modifier);
+    piece->subformat = modifierOf(match->modifier);
 }
 
 void PrintFormatParser::extractFormatPart() {
-    const Conversion& found = conversionOf(match.conversion.front());
-    conversion = found.kind;
-    hasStringConversion = hasStringConversion || conversion == ConvS;
-    if (subformat > found.lastModifier) recordInvalidFormat();
-    if (conversion == ConvC && precisionKind != FieldAbsent) recordInvalidFormat();
-    // Whole numbers are always 64 bits wide, whatever modifier was written.
-    if (found.isInteger()) subformatText += u"ll";
-    subformatText += match.conversion;
+    const Conversion& found = conversions[match->conversion.front()];
+    piece->conversion = found.kind;
+    hasStringConversion = hasStringConversion || piece->conversion == ConvS;
+    if (piece->subformat > found.lastModifier) recordInvalidFormat();
+    if (piece->conversion == ConvC && piece->precisionKind != FieldAbsent) recordInvalidFormat();
 }
 
 // Numbered and sequential references do not mix within one format.
@@ -221,28 +225,15 @@ void PrintFormatParser::setArgumentType(PrintFormatArgumentType type) {
     }
 }
 
+void PrintFormatParser::beginPiece(unsigned long position) {
+    piece = &blocks.emplace_back();
+    piece->forceSign = forceSign;
+    piece->formatPosition = position;
+}
+
 void PrintFormatParser::pushLiteral(std::size_t from, std::size_t to, std::size_t position) {
-    subformatText.append(formatText, from, to - from);
-    pushFormat(position);
-}
-
-void PrintFormatParser::pushFormat(unsigned long position) {
-    pieces.emplace_back(foutFormatPiece::createFoutFormatPiece(
-        conversion, subformat, numberedIndex, flags, widthKind, widthValue, precisionKind,
-        precisionValue, subformatText, forceSign, position));
-    resetStateForNextPiece();
-}
-
-void PrintFormatParser::resetStateForNextPiece() {
-    numberedIndex = 0;
-    flags = NoFlags;
-    widthValue = 0;
-    widthKind = FieldAbsent;
-    precisionValue = 0;
-    precisionKind = FieldAbsent;
-    subformat = NoSubformat;
-    conversion = NoConversion;
-    subformatText.clear();
+    beginPiece(position);
+    piece->written = std::u16string_view(formatText).substr(from, to - from);
 }
 
 void PrintFormatParser::recordInvalidFormat() {

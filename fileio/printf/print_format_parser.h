@@ -6,10 +6,11 @@
 #include "fileio/printf/fout_format_piece.h"
 #include "fileio/printf/vocabulary.h"
 
-#include <memory>
 #include <span>
 #include <string>
-#include <vector>
+#include <string_view>
+
+#include <boost/container/small_vector.hpp>
 
 namespace Orvandeil::FileIO {
 
@@ -45,8 +46,16 @@ public:
     // the stream's code as an int after a short write, std::out_of_range when no piece was taken.
     void printRemainingFormatAsLiteral(TcodnStream* out) const;
 
-    // All pieces of the format, in order.
-    std::span<const std::unique_ptr<foutFormatPiece>> getPieces() const { return pieces; }
+    // All pieces of the format, in order, and what each of them is made from. They are made when
+    // they are first asked for.
+    std::span<foutFormatPiece* const> getPieces();
+    std::span<const foutFormatPieceInitBlock> getInitBlocks() const {
+        return {blocks.data(), blocks.size()};
+    }
+    // Goes on as if the pieces before `index` had been handed out, and the one before it last.
+    void goOnWith(unsigned long index) { nextPiece = index; }
+    unsigned long getNextIndex() const { return nextPiece; }
+
     PrintFormatArgumentType getArgumentType() const { return argumentType; }
     // The conversions other than "%%", and the "*" that take the next argument.
     unsigned long getConversionCount() const { return conversionCount; }
@@ -58,7 +67,7 @@ private:
     friend struct LayoutProbe;
 
     void parse();
-    void parseConversion(std::size_t position);
+    std::size_t parseConversion(std::size_t position);
     bool specialCasePercent();
     void extractNumberedArgPart();
     void extractFlagsPart();
@@ -69,9 +78,8 @@ private:
     // What the "*" of a width or precision refers to, `digits` being the text behind it.
     WidthPrecisionFieldType extractReference(std::u16string_view digits, int& number);
     void setArgumentType(PrintFormatArgumentType type);
+    void beginPiece(unsigned long position);
     void pushLiteral(std::size_t from, std::size_t to, std::size_t position);
-    void pushFormat(unsigned long position);
-    void resetStateForNextPiece();
     void recordInvalidFormat();
 
     std::u16string formatText;
@@ -82,21 +90,14 @@ private:
     bool lastLeftJustified = false;
     const char16_t* trailingLiteral = nullptr;
 
-    unsigned int numberedIndex = 0;
-    PrintFormatFlags flags = NoFlags;
-    int widthValue = 0;
-    WidthPrecisionFieldType widthKind = FieldAbsent;
-    int precisionValue = 0;
-    WidthPrecisionFieldType precisionKind = FieldAbsent;
-    PrintfSubformat subformat = NoSubformat;
-    PrintfFormat conversion = NoConversion;
-    std::u16string subformatText;
-    detail::ConversionToken match;
+    foutFormatPieceInitBlock* piece = nullptr;  // under construction: the last block
+    const detail::ConversionToken* match = nullptr;
 
     PrintFormatArgumentType argumentType = ArgumentsNone;
-    std::vector<std::unique_ptr<foutFormatPiece>> pieces;
+    foutFormatPieceList pieces;
     unsigned long nextPiece = 0;
     int recordedError = 0;
+    boost::container::small_vector<foutFormatPieceInitBlock, 8> blocks;
 };
 
 }  // namespace Orvandeil::FileIO

@@ -8,17 +8,18 @@
 #include "fileio/host/messages.h"
 #include "fileio/printf/element_range.h"
 
+#include <algorithm>
 #include <typeinfo>
 
 namespace Orvandeil::FileIO {
 namespace {
 
-std::vector<std::size_t> objectDimensions(const vxArray* object) {
+[[gnu::noinline]] detail::Dimensions objectDimensions(const vxArray* object) {
     const detail::OwnedArray size(vxDispatchCall("size", &object, 1));
     const bool usable = size && vxArrayClassID(size.get()) == vxDOUBLE_CLASS &&
                         vxArrayIsVector(size.get()) && detail::elementCount(size.get()) >= 2;
     if (!usable) vxErrMsgId(KESTRA::printf::invalidSizeResult(vxArrayClassName(object)));
-    std::vector<std::size_t> dimensions(detail::elementCount(size.get()));
+    detail::Dimensions dimensions(detail::elementCount(size.get()));
     AssignToVoidBuffer(vxUINT64_CLASS, dimensions.data(), VxData(size.get()), dimensions.size());
     return dimensions;
 }
@@ -38,15 +39,11 @@ void printfArgumentSource::setupArg() {
         clearArg();
         dims = objectDimensions(array);
     } else {
-        const std::size_t* const first = vxArrayDimensions(array);
-        dims.assign(first, first + vxArrayDimensionCount(array));
+        dims.resize(vxArrayDimensionCount(array), boost::container::default_init);
+        std::copy_n(vxArrayDimensions(array), dims.size(), dims.data());
     }
-    argLength = detail::elementCount(dims);
-    if (data) {
-        *data = VxData(array);
-    } else {
-        data = std::make_unique<VxData>(array);
-    }
+    argLength = detail::elementCount(std::span(dims.data(), dims.size()));
+    data.emplace(array);
 }
 
 void printfArgumentSource::clearArg() {
@@ -61,7 +58,7 @@ bool printfArgumentSource::hasMoreData() const {
 void printfArgumentSource::setCurrentArgument(std::size_t) {}
 
 bool printfArgumentSource::hasCurrentArg() const {
-    return data != nullptr;
+    return data.has_value();
 }
 
 bool printfArgumentSource::hasMoreArgs() const {
@@ -160,7 +157,7 @@ void printfArgumentSource::skipArguments(std::size_t count) {
 }
 
 detail::PlainElements printfArgumentSource::plainElements() const {
-    if (!data || data->getElements() == nullptr || isCurrentArgumentEmpty()) return {};
+    if (!hasPlainElement()) return {};
     const vxClassID classID = data->getClassID();
     const auto* elements = static_cast<const char*>(data->getElements());
     return {classID, elements + elementIndex * fiPkGetSizeFromClassID(classID),
@@ -264,7 +261,7 @@ void printfMatrixArgumentSource::resetRow() {
 }
 
 std::size_t printfMatrixArgumentSource::columnCount() const {
-    return detail::elementCount(std::span(dims).subspan(1));
+    return detail::elementCount(std::span(dims.data(), dims.size()).subspan(1));
 }
 
 }  // namespace Orvandeil::FileIO

@@ -6,11 +6,12 @@
 #include "fileio/printf/printability.h"
 
 #include <cstddef>
-#include <memory>
+#include <optional>
 #include <span>
 #include <string>
 #include <string_view>
-#include <vector>
+
+#include <boost/container/small_vector.hpp>
 
 namespace Orvandeil::FileIO {
 
@@ -22,6 +23,9 @@ struct PlainElements {
     const char* first = nullptr;
     std::size_t count = 0;
 };
+
+// The lengths of an array's dimensions, which seldom are many.
+using Dimensions = boost::container::small_vector<std::size_t, 4>;
 
 // Copies the leading elements that are character codes, and returns their number.
 std::size_t copyCharacterCodes(const PlainElements& elements, char16_t* out);
@@ -90,6 +94,10 @@ public:
     // The elements that the current argument still has; none for an object, and none without a
     // current argument.
     detail::PlainElements plainElements() const;
+    // Whether there are any.
+    bool hasPlainElement() const {
+        return data && data->getElements() != nullptr && !isCurrentArgumentEmpty();
+    }
     // The arguments from the current one on; none when an element of that one was taken already.
     std::span<const vxArray* const> wholeArguments() const {
         if (elementIndex != 0 || argIndex >= argc) return {};
@@ -107,9 +115,9 @@ protected:
     std::size_t argc;
     std::size_t argIndex = 0;
     std::size_t argLength = 0;
-    std::vector<std::size_t> dims;
+    detail::Dimensions dims;
     std::size_t elementIndex = 0;
-    std::unique_ptr<VxData> data;
+    std::optional<VxData> data;  // none without a current argument
 
 private:
     bool isCharacterCode() const;

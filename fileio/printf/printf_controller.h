@@ -5,8 +5,8 @@
 #include "fileio/printf/print_format_parser.h"
 #include "fileio/printf/printf_argument_source.h"
 
-#include <memory>
 #include <string>
+#include <variant>
 
 namespace Orvandeil::FileIO {
 
@@ -30,23 +30,33 @@ public:
     int getErrorCode() const { return errorCode; }
     const PrintFormatParser& getParser() const { return parser; }
     // The piece that was being printed; null before the first.
-    const foutFormatPiece* getCurrentPiece() const { return currentPiece; }
+    const foutFormatPiece* getCurrentPiece() const {
+        settleCurrentPiece();
+        return currentPiece;
+    }
 
 private:
     friend struct LayoutProbe;
 
+    printfArgumentSource* makeSource(const vxArray** args, std::size_t count);
     void printAllPasses();
     void printFurtherPasses();
     bool printPass();
+    bool printCollected();
+    bool endPass();
+    void settleCurrentPiece() const;
     bool isOutOfData() const;
     bool takePiece();
 
     int errorCode = 0;
-    PrintFormatParser parser;
-    std::unique_ptr<printfArgumentSource> source;
-    foutFormatPiece* currentPiece = nullptr;
+    mutable PrintFormatParser parser;  // makes its pieces when they are looked at
+    printfArgumentSource* source;
+    mutable foutFormatPiece* currentPiece = nullptr;
     TcodnStream* output;
     bool complete = false;
+    mutable bool isCurrentUnmade = false;  // the piece that was handed out last is current
+    std::variant<std::monostate, printfSequentialArgumentSource, printfNumberedArgumentSource>
+        ownSource;
 };
 
 }  // namespace Orvandeil::FileIO

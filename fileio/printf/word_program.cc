@@ -17,7 +17,7 @@ WordProgram::WordProgram(Pieces formatPieces, TcodnStream& out)
 
 bool WordProgram::compile() {
     std::size_t conversions = 0;
-    for (const auto& piece : pieces) {
+    for (const foutFormatPiece* const piece : pieces) {
         literals.push_back(literalTextOf(*piece));
         literalUnits += literals.back().size();
         if (!piece->consumesData()) continue;
@@ -60,7 +60,7 @@ void WordProgram::run(printfArgumentSource& source, foutFormatPiece*& current) c
             copyPass({text, length}, out);
         } else {
             for (std::size_t i = 0; i < pieces.size(); ++i) {
-                current = pieces[i].get();
+                current = pieces[i];
                 put(literals[i].empty() ? std::u16string_view(text, length) : literals[i]);
             }
         }

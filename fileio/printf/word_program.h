@@ -4,7 +4,6 @@
 #include "fileio/printf/printf_argument_source.h"
 #include "fileio/text/output_string_stream.h"
 
-#include <memory>
 #include <span>
 #include <string_view>
 #include <vector>
@@ -15,7 +14,7 @@ namespace Orvandeil::FileIO::detail {
 // UTF-16: whole char arrays are copied there one after the other.
 class WordProgram {
 public:
-    using Pieces = std::span<const std::unique_ptr<foutFormatPiece>>;
+    using Pieces = std::span<foutFormatPiece* const>;
 
     WordProgram(Pieces formatPieces, TcodnStream& out);
 

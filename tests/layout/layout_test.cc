@@ -44,9 +44,10 @@ PRIVATE_FIELDS(foutFormatPiece, variants, variant, numberedIndex, flags, forceSi
 PRIVATE_FIELDS(printfArgumentSource, args, argc, argIndex, argLength, dims, elementIndex, data)
 PRIVATE_FIELDS(printfMatrixArgumentSource, data, rowStart, column)
 PRIVATE_FIELDS(PrintFormatParser, formatText, formatCharacters, forceSign, conversionCount,
-               hasStringConversion, lastLeftJustified, trailingLiteral, numberedIndex, flags,
-               widthValue, widthKind, precisionValue, precisionKind, subformat, conversion,
-               subformatText, match, argumentType, pieces, nextPiece, recordedError)
+               hasStringConversion, lastLeftJustified, trailingLiteral, piece, match, argumentType,
+               pieces, nextPiece, recordedError)
+PRIVATE_FIELDS(foutFormatPieceInitBlock, numberedIndex, flags, width, widthKind, precision,
+               precisionKind, subformat, conversion, written)
 PRIVATE_FIELDS(printfController, errorCode, parser, source, currentPiece, output)
 PRIVATE_FIELDS(finFormatPiece, width, savedWidth, text, asciiText, textLength, suppress, oneChar)
 PRIVATE_FIELDS(finFormatParser, input, pieceStart, cursor, recycled, pieces, nextIndex, resultClass,
@@ -189,6 +190,7 @@ TEST(Layout, ArgumentSources) {
 
 TEST(Layout, OutputDriver) {
     layout::expectOrder(LayoutProbe::fields<PrintFormatParser>(), sizeof(void*));
+    layout::expectOrder(LayoutProbe::fields<foutFormatPieceInitBlock>(), 0);
     layout::expectOrder(LayoutProbe::fields<printfController>(), 0);
 }
 

@@ -37,12 +37,14 @@ private:
 std::string print(const std::u16string& format, std::vector<const vxArray*> arguments) {
     outputStringStream out("UTF-8");
     const auto count = static_cast<int>(arguments.size());
-    const std::string raised = fileio_tests::raisedBy(
-        [&] { printfController(format, &out, arguments.data(), count).doPrintf(); });
-    if (!raised.empty()) return raised;
+    std::unique_ptr<void, decltype(&vxMemoryFree)> block(nullptr, vxMemoryFree);
     long bytes = 0;
-    out.getPosition(bytes);
-    const std::unique_ptr<void, decltype(&vxMemoryFree)> block(out.transferBuffer(), vxMemoryFree);
+    const std::string raised = fileio_tests::raisedBy([&] {
+        printfController(format, &out, arguments.data(), count).doPrintf();
+        out.getPosition(bytes);
+        block.reset(out.transferBuffer());
+    });
+    if (!raised.empty()) return raised;
     return {static_cast<const char*>(block.get()), static_cast<std::size_t>(bytes)};
 }
 
