@@ -37,7 +37,7 @@ struct Conversion {
 };
 
 // By letter.
-constexpr std::array<Conversion, 128> makeConversions() {
+consteval std::array<Conversion, 128> makeConversions() {
     std::array<Conversion, 128> all{};
     const auto add = [&all](std::string_view letters, PrintfFormat kind, PrintfSubformat last) {
         for (const char letter : letters)

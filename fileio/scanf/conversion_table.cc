@@ -2,21 +2,20 @@
 
 #include "fileio/scanf/fin_format_pieces.h"
 
-#include <algorithm>
+#include <array>
 #include <iterator>
-#include <string_view>
 
 namespace Orvandeil::FileIO::detail {
 namespace {
 
 template <class Piece>
-std::unique_ptr<finFormatPiece> create(const finFormatPieceInitBlock& init) {
-    return std::make_unique<Piece>(init);
+finFormatPiece* create(finFormatPieceList& pieces, const finFormatPieceInitBlock& init) {
+    return &pieces.emplace<Piece>(init);
 }
 
 // Only 64-bit integers are read into a class of their own; everything else ends up as a double.
 template <template <class> class Functor>
-consteval ScanConversion signedRow(FORMAT format, const char16_t* letters) {
+consteval ScanConversion signedRow(FORMAT format, const char* letters) {
     return {format,
             letters,
             {create<finFormatPieceT<Functor<int>, vxDOUBLE_CLASS>>,
@@ -25,7 +24,7 @@ consteval ScanConversion signedRow(FORMAT format, const char16_t* letters) {
 }
 
 template <template <class> class Functor>
-consteval ScanConversion unsignedRow(FORMAT format, const char16_t* letters) {
+consteval ScanConversion unsignedRow(FORMAT format, const char* letters) {
     return {format,
             letters,
             {create<finFormatPieceT<Functor<unsigned int>, vxDOUBLE_CLASS>>,
@@ -37,29 +36,32 @@ using FloatPiece = finFormatPieceT<FloatReadingFunctor<double>, vxDOUBLE_CLASS>;
 using ShortFloatPiece = finFormatPieceT<FloatReadingFunctor<float>, vxDOUBLE_CLASS>;
 
 constexpr ScanConversion conversions[] = {
-    signedRow<IntegerReadingFunctor>(FORMAT::Integer, u"d"),
-    signedRow<IntegerCouldBeHexReadingFunctor>(FORMAT::IntegerOrHex, u"i"),
-    unsignedRow<UnsignedIntegerReadingFunctor>(FORMAT::Unsigned, u"u"),
-    unsignedRow<HexReadingFunctor>(FORMAT::Hex, u"xX"),
-    unsignedRow<OctalReadingFunctor>(FORMAT::Octal, u"o"),
-    {FORMAT::Float, u"efgEG", {create<FloatPiece>, create<ShortFloatPiece>, create<FloatPiece>}},
-    {FORMAT::String, u"s", {create<finFormatPieceS>, nullptr, nullptr}},
-    {FORMAT::Char, u"c", {create<finFormatPieceC>, nullptr, nullptr}},
+    signedRow<IntegerReadingFunctor>(FORMAT::Integer, "d"),
+    signedRow<IntegerCouldBeHexReadingFunctor>(FORMAT::IntegerOrHex, "i"),
+    unsignedRow<UnsignedIntegerReadingFunctor>(FORMAT::Unsigned, "u"),
+    unsignedRow<HexReadingFunctor>(FORMAT::Hex, "xX"),
+    unsignedRow<OctalReadingFunctor>(FORMAT::Octal, "o"),
+    {FORMAT::Float, "efgEG", {create<FloatPiece>, create<ShortFloatPiece>, create<FloatPiece>}},
+    {FORMAT::String, "s", {create<finFormatPieceS>, nullptr, nullptr}},
+    {FORMAT::Char, "c", {create<finFormatPieceC>, nullptr, nullptr}},
 };
+
+// The rows by letter, counted from 1.
+consteval std::array<unsigned char, 128> makeRows() {
+    std::array<unsigned char, 128> rows{};
+    for (unsigned char i = 0; i < std::size(conversions); ++i) {
+        for (const char* letter = conversions[i].letters; *letter != 0; ++letter)
+            rows[static_cast<unsigned char>(*letter)] = static_cast<unsigned char>(i + 1);
+    }
+    return rows;
+}
+constexpr std::array<unsigned char, 128> rowOfLetter = makeRows();
 
 }  // namespace
 
 const ScanConversion* findScanConversion(char16_t letter) {
-    const auto hasLetter = [letter](const ScanConversion& row) {
-        return std::u16string_view(row.letters).find(letter) != std::u16string_view::npos;
-    };
-    const auto* found = std::find_if(std::begin(conversions), std::end(conversions), hasLetter);
-    return found == std::end(conversions) ? nullptr : found;
-}
-
-const ScanConversion& scanConversion(FORMAT format) {
-    return *std::find_if(std::begin(conversions), std::end(conversions),
-                         [format](const ScanConversion& row) { return row.format == format; });
+    const unsigned row = letter < rowOfLetter.size() ? rowOfLetter[letter] : 0U;
+    return row == 0 ? nullptr : &conversions[row - 1];
 }
 
 }  // namespace Orvandeil::FileIO::detail

@@ -1,6 +1,7 @@
 #include "fileio/scanf/fin_format_parser.h"
 
 #include "fileio/errors/code_list.h"
+#include "fileio/printf/digits.h"
 #include "fileio/printf/escape_sequences.h"
 #include "fileio/scanf/conversion_table.h"
 #include "fileio/scanf/fin_format_pieces.h"
@@ -30,18 +31,14 @@ finFormatParser::finFormatParser(const char16_t* format, TcodnStream* readFrom)
 finFormatParser::~finFormatParser() = default;
 
 void finFormatParser::InitFormatPieces() {
-    constexpr std::size_t usualPieces = 8;
     resultClass = vxCHAR_CLASS;
-    pieces.reserve(usualPieces);
     do {
-        Piece piece = fiPkCreateNextScanFormatPiece();
+        const Piece piece = fiPkCreateNextScanFormatPiece();
         if (!piece) {
-            pieces.push_back(
-                std::make_unique<finFormatPieceError>(finFormatPieceInitBlock{pieceStart}, error));
+            pieces.emplace<finFormatPieceError>(finFormatPieceInitBlock{pieceStart}, error);
             break;
         }
         addResultClass(*piece);
-        pieces.push_back(std::move(piece));
     } while (*pieceStart != 0);
     nextIndex = 0;
 }
@@ -69,7 +66,7 @@ finFormatPiece* finFormatParser::fiPkGetScanFormatPiece(std::size_t index, int& 
     }
     status = 0;
     pieces[index]->restoreWidth();
-    return pieces[index].get();
+    return pieces[index];
 }
 
 finFormatParser::Piece finFormatParser::fiPkCreateNextScanFormatPiece() {
@@ -80,7 +77,7 @@ finFormatParser::Piece finFormatParser::fiPkCreateNextScanFormatPiece() {
             if (*cursor == 0) return parseEndOfFormat(state);
             state = State::LiteralSeen;
         }
-        Piece piece = parsePercentInFormat(state);
+        const Piece piece = parsePercentInFormat(state);
         if (piece || error != 0) return piece;
     }
 }
@@ -116,12 +113,14 @@ finFormatParser::Piece finFormatParser::FinParseConversionPart() {
 std::optional<finFormatParser::Field> finFormatParser::CheckForAsteriskAndFieldWidth() {
     Field field;
     if (*cursor == u'*') field.asterisk = cursor++;
-    char16_t* end = nullptr;
-    const int number = scanUTF16Decimal(cursor, &end);
-    const bool hasWidth = end != cursor;
-    if (hasWidth) field.width = number;
-    cursor = end;
-    if (*cursor == 0 || (hasWidth && number < 1)) {
+    const char16_t* const digits = cursor;
+    if (*cursor == u'-' || detail::isDecimalDigit(*cursor)) {
+        char16_t* end = nullptr;
+        const int number = scanUTF16Decimal(digits, &end);
+        if (end != digits) field.width = number;
+        cursor = end;
+    }
+    if (*cursor == 0 || (cursor != digits && field.width < 1)) {
         recordError(code::InvalidFormat);
         return std::nullopt;
     }
@@ -135,7 +134,7 @@ finFormatParser::Piece finFormatParser::parseScansetConversion(const Field& fiel
     if (*cursor == 0) return recordError(code::InvalidFormat);
     ++cursor;
     std::u16string joined;
-    return std::make_unique<finFormatPieceCMATCH>(
+    return &pieces.emplace<finFormatPieceCMATCH>(
         finFormatPieceInitBlock{takePieceText(field, joined), field.width,
                                 field.asterisk != nullptr},
         open);
@@ -159,19 +158,19 @@ finFormatParser::Piece finFormatParser::parseFormat(SUB_FORMAT sub, const Field&
     if (!conversion || !conversion->create[static_cast<int>(sub)])
         return recordError(code::InvalidFormat);
     ++cursor;
-    return createNewFormatPiece(conversion->format, sub, field);
+    return createNewFormatPiece(*conversion, sub, field);
 }
 
-finFormatParser::Piece finFormatParser::createNewFormatPiece(FORMAT kind, SUB_FORMAT sub,
-                                                             const Field& field) {
+finFormatParser::Piece finFormatParser::createNewFormatPiece(
+    const detail::ScanConversion& conversion, SUB_FORMAT sub, const Field& field) {
     std::u16string joined;
-    return detail::scanConversion(kind).create[static_cast<int>(sub)](
-        {takePieceText(field, joined), field.width, field.asterisk != nullptr});
+    return conversion.create[static_cast<int>(sub)](
+        pieces, {takePieceText(field, joined), field.width, field.asterisk != nullptr});
 }
 
 finFormatParser::Piece finFormatParser::createLiteralFormatPiece() {
     std::u16string joined;
-    return std::make_unique<finFormatPieceLiteral>(
+    return &pieces.emplace<finFormatPieceLiteral>(
         finFormatPieceInitBlock{takePieceText({}, joined), 0, false}, input);
 }
 

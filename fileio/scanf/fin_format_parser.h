@@ -4,13 +4,15 @@
 #include "fileio/memory_operation_overloads.h"
 #include "fileio/scanf/fin_format_piece.h"
 
-#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
-#include <vector>
 
 namespace Orvandeil::FileIO {
+
+namespace detail {
+struct ScanConversion;
+}
 
 // Splits an input format into pieces, chooses the class of the result, and hands the pieces out in
 // order, over and over. A format error ends the parse and becomes the last piece, so that
@@ -56,7 +58,7 @@ public:
 
 private:
     friend struct LayoutProbe;
-    using Piece = std::unique_ptr<finFormatPiece>;
+    using Piece = finFormatPiece*;  // in the list; null when there is none
     enum class State { NothingSeen, LiteralSeen };
     // What stands between "%" and the conversion letter.
     struct Field {
@@ -72,7 +74,8 @@ private:
     Piece parseScansetConversion(const Field& field);
     SUB_FORMAT parseSubFormat();
     Piece parseFormat(SUB_FORMAT sub, const Field& field);
-    Piece createNewFormatPiece(FORMAT kind, SUB_FORMAT sub, const Field& field);
+    Piece createNewFormatPiece(const detail::ScanConversion& conversion, SUB_FORMAT sub,
+                               const Field& field);
     Piece createLiteralFormatPiece();
     Piece parseEndOfFormat(State state);
     Piece recordError(int code);
@@ -83,7 +86,7 @@ private:
     const char16_t* pieceStart;
     const char16_t* cursor;
     bool recycled = false;
-    std::vector<Piece> pieces;
+    finFormatPieceList pieces;
     std::size_t nextIndex = 0;
     vxClassID resultClass = vxCHAR_CLASS;
     int error = 0;

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <climits>
+#include <iterator>
 
 namespace Orvandeil::FileIO {
 
@@ -16,23 +17,30 @@ finFormatPiece::HostText<Unit> finFormatPiece::copyText(const Unit* source, std:
     return copy;
 }
 
+void finFormatPiece::keepText(std::u16string_view source) {
+    textLength = source.size() + 1;
+    if (textLength <= std::size(shortText)) {
+        *std::copy(source.begin(), source.end(), shortText) = 0;
+        text = shortText;
+    } else {
+        longText = copyText(source.data(), source.size());
+        text = longText.get();
+    }
+}
+
 finFormatPiece::finFormatPiece(const finFormatPieceInitBlock& init)
-    : width(init.width),
-      savedWidth(init.width),
-      textLength(init.text.size() + 1),
-      suppress(init.suppress) {
+    : width(init.width), savedWidth(init.width), suppress(init.suppress) {
     if (init.text.size() > INT_MAX) vxErrMsgId(KESTRA::legacy_two_part::p64bitsize());
-    text = copyText(init.text.data(), init.text.size());
+    keepText(init.text);
 }
 
 finFormatPiece::finFormatPiece(const finFormatPiece& other)
     : fiMemoryOperationOverloads(other),
       width(other.width),
       savedWidth(other.savedWidth),
-      text(copyText(other.text.get(), other.textLength - 1)),
-      textLength(other.textLength),
       suppress(other.suppress),
       oneChar(other.oneChar) {
+    keepText(other.getText());
     if (other.asciiText) asciiText = copyText(other.asciiText.get(), textLength - 1);
 }
 

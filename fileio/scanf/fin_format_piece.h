@@ -4,6 +4,7 @@
 #include "fileio/export.h"
 #include "fileio/host/arrays.h"
 #include "fileio/memory_operation_overloads.h"
+#include "fileio/piece_list.h"
 #include "fileio/scanf/vocabulary.h"
 #include "fileio/text/tcodn_stream.h"
 
@@ -46,7 +47,7 @@ public:
     virtual FORMAT getFormat() const = 0;
 
     // The piece's part of the format, without the "*" of a suppressed conversion; NUL-terminated.
-    std::u16string_view getText() const { return {text.get(), textLength - 1}; }
+    std::u16string_view getText() const { return {text, textLength - 1}; }
     // The same in ASCII; null when it holds anything else. Made when it is first asked for.
     const char* getAsciiText();
     // The width as parsed: -1 for none, 0 for a literal.
@@ -73,19 +74,27 @@ private:
 
     template <class Unit>
     static HostText<Unit> copyText(const Unit* source, std::size_t count);
+    void keepText(std::u16string_view source);
 
 protected:
     int width;
 
 private:
     int savedWidth;
-    HostText<char16_t> text;
+    const char16_t* text;
     HostText<char> asciiText;
     std::size_t textLength;  // its terminator included
 
 protected:
     bool suppress;
     std::u16string oneChar;
+
+private:
+    // Where the text is.
+    HostText<char16_t> longText;
+    char16_t shortText[12];
 };
+
+using finFormatPieceList = detail::PieceList<finFormatPiece, 1024>;
 
 }  // namespace Orvandeil::FileIO
