@@ -6,8 +6,8 @@
 #include "fileio/memory_operation_overloads.h"
 
 #include <cstddef>
-#include <vector>
 
+#include <boost/container/small_vector.hpp>
 #include <boost/shared_ptr.hpp>
 
 namespace Orvandeil::FileIO {
@@ -103,8 +103,8 @@ private:
     std::size_t maxChunk;
     std::size_t currentCapacity;
     std::size_t lastRequest = 0;
-    std::vector<char*> chunks;
-    std::vector<std::size_t> chunkCounts;
+    boost::container::small_vector<char*, 2> chunks;
+    boost::container::small_vector<std::size_t, 2> chunkCounts;
     std::size_t elementsBeforeLast = 0;
     vxClassID classID;
     std::size_t typeSize;
