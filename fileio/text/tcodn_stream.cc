@@ -10,7 +10,6 @@
 #include <array>
 #include <clocale>
 #include <cstring>
-#include <strings.h>
 #include <utility>
 
 namespace Orvandeil::FileIO {
@@ -47,8 +46,15 @@ const char* nameOf(const UConverter* converter) {
     return U_SUCCESS(status) && name ? name : "";
 }
 
+// Without asking the locale: most names differ at once.
 bool sameName(const char* a, const char* b) {
-    return strcasecmp(a, b) == 0;
+    const auto lower = [](char letter) {
+        return letter >= 'A' && letter <= 'Z' ? static_cast<char>(letter | 0x20) : letter;
+    };
+    for (; lower(*a) == lower(*b); ++a, ++b) {
+        if (*a == 0) return true;
+    }
+    return false;
 }
 
 }  // namespace
