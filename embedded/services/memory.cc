@@ -7,6 +7,7 @@
 #include <cerrno>
 #include <cstdint>
 #include <cstdlib>
+#include <cstring>
 #include <malloc.h>
 
 #include <sys/mman.h>
@@ -93,6 +94,23 @@ bool isCutLittle([[maybe_unused]] void* block, [[maybe_unused]] std::size_t byte
 #endif
 }
 
+// A small block that shrinks a lot is copied: cut in place it would leave a rest of an odd size,
+// and the next block of the old size could not be taken from the allocator's lists of free ones.
+void* resized(void* block, std::size_t bytes) {
+#ifdef FILEIO_FAST_PATHS
+    constexpr std::size_t mostBytes = 16384;
+    const std::size_t present = malloc_usable_size(block);
+    if (present <= mostBytes && bytes <= present / 4) {
+        void* const copy = std::malloc(bytes);
+        if (copy == nullptr) return nullptr;
+        std::memcpy(copy, block, bytes);
+        std::free(block);
+        return copy;
+    }
+#endif
+    return std::realloc(block, bytes);
+}
+
 }  // namespace
 
 std::size_t liveBlockCount() {
@@ -141,7 +159,7 @@ void* vxMemoryReallocateOrRaise(void* block, std::size_t bytes) {
     if (block == nullptr) return vxMemoryAllocateOrRaise(bytes);
     if (bytes <= largestBlock && mayAllocate()) {
         if (isCutLittle(block, bytes)) return block;
-        void* const moved = std::realloc(block, std::max<std::size_t>(bytes, 1));
+        void* const moved = resized(block, std::max<std::size_t>(bytes, 1));
         if (moved != nullptr) return advised(moved, bytes);
     }
     vxMemoryRaiseExhausted();
