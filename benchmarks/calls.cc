@@ -9,14 +9,20 @@
 namespace bench {
 namespace {
 
-constexpr int calls = 20000;
+// So many that a run takes long enough to be timed, and seldom so long that it is interrupted.
+constexpr int calls = 2000;
 
-// Runs `call` many times; its result is that of the last.
-template <class Call>
-std::function<void(Trial&)> repeated(Call call) {
-    return [call](Trial& trial) {
-        for (int i = trial.compares() ? calls - 1 : 0; i < calls; ++i)
-            call(trial);
+// Makes the result many times, each in the place of the one before, and hands on the last.
+template <class Call, class Tell>
+std::function<void(Trial&)> repeated(Call call, Tell tell) {
+    return [=](Trial& trial) {
+        const int count = trial.compares() ? 1 : calls;
+        decltype(call()) last;
+        trial.time([&] {
+            for (int i = 0; i < count; ++i)
+                last = call();
+        });
+        tell(trial, last);
     };
 }
 
@@ -30,7 +36,9 @@ Job makePrintJob(Context&) {
     static const ArrayPtr whole = Orvandeil::FileIO::embedded::makeScalar(12);
     static const ArrayPtr real = Orvandeil::FileIO::embedded::makeScalar(3.14159);
     static const vxArray* arguments[] = {whole.get(), real.get()};
-    const auto library = [](Trial& trial) { printToBlock(trial, u"%d,%8.3f\n", arguments); };
+    static const std::u16string format = u"%d,%8.3f\n";
+    const auto library = [] { return printed(format, arguments); };
+    const auto tell = [](Trial& trial, const Printed& last) { trial.result(last.text()); };
     const auto loop = [](auto print) {
         return [print](Trial& trial) {
             const int count = trial.compares() ? 1 : calls;
@@ -52,11 +60,15 @@ Job makePrintJob(Context&) {
         char* const comma = put(std::to_chars(text, std::end(text), 12).ptr, ',');
         return static_cast<std::size_t>(put(putFixed(comma, 3.14159, 8, 3), '\n') - text);
     };
-    return perCall({{ours, repeated(library)}, {"sprintf", loop(byC)}, {limit, loop(byChars)}});
+    return perCall(
+        {{ours, repeated(library, tell)}, {"sprintf", loop(byC)}, {limit, loop(byChars)}});
 }
 
 Job makeScanJob(Context&) {
-    const auto library = [](Trial& trial) { scanBytes(trial, "12,3.5", u"%d,%f"); };
+    static const std::string fields = "12,3.5";
+    static const std::u16string format = u"%d,%f";
+    const auto library = [] { return scanned(fields, format); };
+    const auto tell = [](Trial& trial, const ArrayPtr& last) { resultOfArray(trial, *last); };
     const auto loop = [](auto scan) {
         return [scan](Trial& trial) {
             const int count = trial.compares() ? 1 : calls;
@@ -83,7 +95,8 @@ Job makeScanJob(Context&) {
         std::from_chars(comma + 1, end, values[1]);
         values[0] = whole;
     };
-    return perCall({{ours, repeated(library)}, {"sscanf", loop(byC)}, {limit, loop(byChars)}});
+    return perCall(
+        {{ours, repeated(library, tell)}, {"sscanf", loop(byC)}, {limit, loop(byChars)}});
 }
 
 }  // namespace

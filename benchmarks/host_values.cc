@@ -1,6 +1,5 @@
 #include "benchmarks/host_values.h"
 
-#include "fileio/buffers/host_block.h"
 #include "fileio/buffers/output_buffer.h"
 #include "fileio/printf/printf_controller.h"
 #include "fileio/scanf/scan_control.h"
@@ -11,35 +10,39 @@ namespace bench {
 
 using namespace Orvandeil::FileIO;
 
+Printed printed(const std::u16string& format, std::span<const vxArray*> arrays) {
+    outputStringStream out("");
+    printfController controller(format, &out, arrays.data(), static_cast<int>(arrays.size()));
+    controller.doPrintf();
+    long bytes = 0;
+    out.getPosition(bytes);
+    return {detail::HostBytes(static_cast<char*>(out.transferBuffer())),
+            static_cast<std::size_t>(bytes) / sizeof(char16_t)};
+}
+
 void printToBlock(Trial& trial, const std::u16string& format,
                   std::span<const vxArray* const> arrays) {
     std::vector<const vxArray*> arguments(arrays.begin(), arrays.end());
-    long bytes = 0;
-    const detail::HostBytes block = trial.time([&] {
-        outputStringStream out("");
-        printfController controller(format, &out, arguments.data(),
-                                    static_cast<int>(arguments.size()));
-        controller.doPrintf();
-        out.getPosition(bytes);
-        return detail::HostBytes(static_cast<char*>(out.transferBuffer()));
-    });
-    trial.result(std::u16string_view(reinterpret_cast<const char16_t*>(block.get()),
-                                     static_cast<std::size_t>(bytes) / sizeof(char16_t)));
+    const Printed result = trial.time([&] { return printed(format, arguments); });
+    trial.result(result.text());
+}
+
+ArrayPtr scanned(const std::string& text, const std::u16string& format) {
+    // Chunks as the built-ins take them.
+    constexpr std::size_t usualChunk = 4;
+    constexpr std::size_t largestChunk = 1 << 23;
+    inputStringStream stream(text.c_str(), static_cast<long>(text.size()), "UTF-8");
+    finFormatParser parser(format.c_str(), &stream);
+    parser.InitFormatPieces();
+    OutputBuffer values(parser.getResultClass(), usualChunk, usualChunk, largestChunk);
+    unsigned long count = 0;
+    scanControl control(0, true, count, stream, parser, values);
+    control.performMainScan();
+    return ArrayPtr(values.TransferArray());
 }
 
 void scanBytes(Trial& trial, const std::string& text, const std::u16string& format) {
-    constexpr std::size_t usualChunk = 1024;
-    constexpr std::size_t largestChunk = 1 << 23;
-    const ArrayPtr array = trial.time([&] {
-        inputStringStream stream(text.c_str(), static_cast<long>(text.size()), "UTF-8");
-        finFormatParser parser(format.c_str(), &stream);
-        parser.InitFormatPieces();
-        OutputBuffer values(parser.getResultClass(), usualChunk, usualChunk, largestChunk);
-        unsigned long count = 0;
-        scanControl control(0, true, count, stream, parser, values);
-        control.performMainScan();
-        return ArrayPtr(values.TransferArray());
-    });
+    const ArrayPtr array = trial.time([&] { return scanned(text, format); });
     resultOfArray(trial, *array);
 }
 
