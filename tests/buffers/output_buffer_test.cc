@@ -202,19 +202,6 @@ TEST(OutputBuffer, AppendsScalarsOfTheirOwnClass) {
     EXPECT_EQ(appended<unsigned long long>(1ull << 63), 0x1p63);
 }
 
-TEST(OutputBuffer, FlipsElementsOfEverySize) {
-    for (const vxClassID classID : {vxINT8_CLASS, vxCHAR_CLASS, vxSINGLE_CLASS, vxUINT64_CLASS}) {
-        std::string bytes = "12345678";
-        OutputBuffer buffer(classID, 0, 0, 0);
-        const std::size_t size = buffer.GetTypeSize();
-        buffer.AppendData(classID, bytes.data(), 8 / size);
-        buffer.FlipBytes();
-        for (auto at = bytes.begin(); at != bytes.end(); at += static_cast<std::ptrdiff_t>(size))
-            std::reverse(at, at + static_cast<std::ptrdiff_t>(size));
-        EXPECT_EQ(std::memcmp(buffer.Transfer().get(), bytes.data(), 8), 0) << bytes;
-    }
-}
-
 // Hands `count` ones over, filled in by pieces: "rows x columns" of the array they become. It has
 // zeros behind them.
 std::string shapeOf(vxClassID classID, std::size_t count, std::vector<double> size,
