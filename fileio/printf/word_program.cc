@@ -6,6 +6,7 @@
 
 #include <cstring>
 #include <typeinfo>
+#include <utility>
 
 namespace Orvandeil::FileIO::detail {
 
@@ -51,9 +52,12 @@ void WordProgram::run(printfArgumentSource& source, foutFormatPiece*& current) c
     AsciiOutput output(*string);
     const std::span<const vxArray* const> arguments = source.wholeArguments();
     std::size_t done = 0;
+    vxClassID nextClass = arguments.empty() ? vxUNKNOWN_CLASS : vxArrayClassID(arguments.front());
     while (done + 1 < arguments.size()) {
         const vxArray* const array = arguments[done];
-        if (vxArrayClassID(array) != vxCHAR_CLASS) break;
+        const vxClassID classID = std::exchange(nextClass, vxArrayClassID(arguments[done + 1]));
+        // The step to an object may raise, which comes before the text in front of it is written.
+        if (classID != vxCHAR_CLASS || nextClass == vxOBJECT_CLASS) break;
         const auto* const text = static_cast<const char16_t*>(vxArrayData(array));
         const std::size_t length = elementCount(array);
         if (char16_t* const out = output.takeUnits(length + literalUnits)) {
