@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <limits>
+#include <utility>
 
 #include <unicode/utf16.h>
 
@@ -143,17 +144,34 @@ unsigned long finFormatPieceLiteral::scan(TcodnStream& /*input*/, OutputBuffer& 
             ++i;
             continue;
         }
+        // The character behind a "%" is not looked at; this is on purpose.
+        const std::size_t next = i + (wanted[i] == u'%' ? 2 : 1);
+        const char16_t unit = wanted[std::exchange(i, next)];
+#ifdef FILEIO_FAST_PATHS
+        if (takeEqual(unit)) continue;
+#endif
         std::size_t bytes = 0;
         if (source->GetNCodePoints(oneChar, 1, &bytes) == 0) return fail(0, failed, status);
-        if (oneChar.front() != wanted[i]) {
+        if (oneChar.front() != unit) {
             source->Rewind(bytes);
             return fail(code::MatchingFailure, failed, status);
         }
-        // The character behind a "%" is not looked at; this is on purpose.
-        i += wanted[i] == u'%' ? 2 : 1;
     }
     return 0;
 }
+
+#ifdef FILEIO_FAST_PATHS
+// Takes the next character when it lies in memory and is the one wanted.
+bool finFormatPieceLiteral::takeEqual(char16_t wanted) {
+    using Verdict = detail::UnitsAhead::Verdict;
+    bool isEqual = false;
+    detail::UnitsAhead(*source).takeWhile([&isEqual, wanted](char16_t unit) {
+        isEqual = unit == wanted;
+        return isEqual ? Verdict::TakeLast : Verdict::GiveBack;
+    });
+    return isEqual;
+}
+#endif
 
 finFormatPieceError::finFormatPieceError(const finFormatPieceInitBlock& init, int errorCode)
     : finFormatPieceOfText(init), code(errorCode) {}

@@ -73,6 +73,8 @@ public:
 private:
     friend struct LayoutProbe;
 
+    bool takeEqual(char16_t unit);
+
     TcodnStream* source;
 };
 
