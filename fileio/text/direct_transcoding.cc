@@ -285,9 +285,6 @@ Progress encodeByTable(const ByteTable& table, const char16_t* text, std::size_t
 }  // namespace
 
 DirectForm directFormOf(const UConverter* converter) {
-    UErrorCode status = U_ZERO_ERROR;
-    const char* const name = ucnv_getName(converter, &status);
-    const std::string_view known = U_SUCCESS(status) && name ? name : "";
     switch (ucnv_getType(converter)) {
         case UCNV_US_ASCII:
             return DirectForm::Ascii;
@@ -303,6 +300,9 @@ DirectForm directFormOf(const UConverter* converter) {
             break;
     }
     // Variants that look for a byte order mark have names of their own.
+    UErrorCode status = U_ZERO_ERROR;
+    const char* const name = ucnv_getName(converter, &status);
+    const std::string_view known = U_SUCCESS(status) && name ? name : "";
     if (known == "UTF-16LE") return DirectForm::Utf16LE;
     return known == "UTF-16BE" ? DirectForm::Utf16BE : DirectForm::None;
 }

@@ -98,11 +98,12 @@ std::string TcodnStream::GetEncodingName() {
 }
 
 void TcodnStream::SetEncodingSpecificFlags() {
-    const char* name = nameOf(converter);
+    directForm = detail::directFormOf(converter);
+    // The most frequent encoding is neither.
+    const char* const name = directForm == detail::DirectForm::Utf8 ? "" : nameOf(converter);
     latinFixed = std::any_of(latinFixedNames.begin(), latinFixedNames.end(),
                              [name](const char* latin) { return sameName(name, latin); });
     utf16 = sameName(name, "UTF-16");
-    directForm = detail::directFormOf(converter);
     asciiTransparent = detail::isAsciiTransparent(directForm);
     byteTable = nullptr;
 }
