@@ -14,6 +14,7 @@
 namespace Orvandeil::FileIO {
 namespace {
 
+// Not part of its caller, which is called for every argument.
 [[gnu::noinline]] detail::Dimensions objectDimensions(const vxArray* object) {
     const detail::OwnedArray size(vxDispatchCall("size", &object, 1));
     const bool usable = size && vxArrayClassID(size.get()) == vxDOUBLE_CLASS &&
