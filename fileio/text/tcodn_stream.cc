@@ -59,9 +59,10 @@ bool sameName(const char* a, const char* b) {
 
 }  // namespace
 
-TcodnStream::TcodnStream(std::string encoding) : asciiSoFar(encoding.empty()) {
+TcodnStream::TcodnStream(std::string encoding)
+    : utf16(encoding == unitEncoding), asciiSoFar(encoding.empty()) {
     useCNumericLocale();
-    if (!encoding.empty()) openConverter(encoding);
+    if (!encoding.empty() && !utf16) openConverter(encoding);
 }
 
 TcodnStream::~TcodnStream() {
