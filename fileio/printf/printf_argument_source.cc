@@ -8,7 +8,6 @@
 #include "fileio/host/messages.h"
 #include "fileio/printf/element_range.h"
 
-#include <algorithm>
 #include <typeinfo>
 
 namespace Orvandeil::FileIO {
@@ -40,8 +39,11 @@ void printfArgumentSource::setupArg() {
         clearArg();
         dims = objectDimensions(array);
     } else {
-        dims.resize(vxArrayDimensionCount(array), boost::container::default_init);
-        std::copy_n(vxArrayDimensions(array), dims.size(), dims.data());
+        const std::size_t count = vxArrayDimensionCount(array);
+        const std::size_t* const lengths = vxArrayDimensions(array);
+        dims.clear();
+        for (std::size_t i = 0; i < count; ++i)
+            dims.push_back(lengths[i]);
     }
     argLength = detail::elementCount(std::span(dims.data(), dims.size()));
     data.emplace(array);
