@@ -87,8 +87,9 @@ void* advised(void* block, [[maybe_unused]] std::size_t bytes) {
 bool isCutLittle([[maybe_unused]] void* block, [[maybe_unused]] std::size_t bytes) {
 #ifdef FILEIO_FAST_PATHS
     constexpr std::size_t leastBytes = std::size_t{128} << 10;
+    if (bytes < leastBytes) return false;
     const std::size_t present = malloc_usable_size(block);
-    return bytes >= leastBytes && bytes <= present && bytes >= present / 2;
+    return bytes <= present && bytes >= present / 2;
 #else
     return false;
 #endif
