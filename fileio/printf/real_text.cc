@@ -75,9 +75,10 @@ char* writeScientific(char* out, const NumberForm& form, char sign, const Signif
     return closeField(begin, writeExponent(out + digitsLength, letter, value.exponent), form);
 }
 
-// `before` digits, the point, the rest of `count` digits.
-char* writePointed(char* out, const NumberForm& form, char sign, Word128 text, int before,
-                   int count) {
+// `before` digits, the point, the rest of `count` digits, which are at most as many as the word
+// has.
+template <class Word>
+char* writePointed(char* out, const NumberForm& form, char sign, Word text, int before, int count) {
     char* const begin = out;
     const bool point = count > before;
     const int length = std::max(count, before) + (point ? 1 : 0);
@@ -118,18 +119,26 @@ char* writeByLibrary(char* out, const NumberForm& form, double value) {
     return closeField(begin, std::copy(digits, end, out), form);
 }
 
+// All digits of a word, the decimals last, less the zeros in front; one stays before the point.
+template <class Word>
+char* writeFixedDigits(char* out, const NumberForm& form, char sign, Word digits) {
+    constexpr int count = sizeof(Word);
+    const int before = count - form.precision;
+    const int leading = std::min(leadingZeroBytes(digits), before - 1);
+    const Word text = (digits | static_cast<Word>(sixteenZeros)) >> 8 * leading;
+    return writePointed(out, form, sign, text, before - leading, count - leading);
+}
+
 char* writeFixed(char* out, const NumberForm& form, double value) {
     const double magnitude = std::abs(value);
     if (!(magnitude < form.plainLimit)) return writeByLibrary(out, form, value);
     Scaled scaled = {0, true};
     if (magnitude != 0) scaled = scaleAndRound(decompose(magnitude), form.precision);
     if (!scaled.certain) return writeByLibrary(out, form, value);
-    const Word128 digits = sixteenDigits(scaled.number);
-    const int before = wordDigits - form.precision;
-    const int leading = std::min(leadingZeroBytes(digits), before - 1);
-    const Word128 text = (digits | sixteenZeros) >> 8 * leading;
-    return writePointed(out, form, signOf(form, value), text, before - leading,
-                        wordDigits - leading);
+    if (scaled.number < tenTo8 && form.precision < 8) {
+        return writeFixedDigits(out, form, signOf(form, value), eightDigits(scaled.number));
+    }
+    return writeFixedDigits(out, form, signOf(form, value), sixteenDigits(scaled.number));
 }
 
 char* writeWithExponent(char* out, const NumberForm& form, double value) {
