@@ -261,7 +261,7 @@ Arguments listed(const std::vector<ArrayPtr>& owned, std::size_t times) {
 
 // How much padding of text stands before a failure depends on the stream: known ones take it in
 // blocks.
-std::string withoutPads(std::string text) {
+[[maybe_unused]] std::string withoutPads(std::string text) {
     std::erase_if(text, [](char letter) { return letter == ' ' || letter == '0' || letter == 0; });
     return text;
 }

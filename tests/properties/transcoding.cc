@@ -65,8 +65,7 @@ std::string encodedAtOnce(const char* encoding, std::u16string_view text) {
 
 // Whether a converter of ICU's, fed in pieces, does not give what it gives for the whole.
 bool dependsOnPieces(std::string_view encoding, bool isDecoding) {
-    if (isDecoding) return encoding == "x11-compound-text";
-    return encoding == "SCSU" || encoding == "LMBCS-1";
+    return encoding == "SCSU" || encoding == (isDecoding ? "x11-compound-text" : "LMBCS-1");
 }
 
 }  // namespace

@@ -3,12 +3,11 @@
 #include "fileio/text/input_string_stream.h"
 
 #include <algorithm>
-#include <stdexcept>
 #include <string>
 #include <string_view>
 #include <vector>
 
-#include <unicode/ucnv.h>
+#include <unicode/unistr.h>
 #include <unicode/utf16.h>
 
 namespace Orvandeil::FileIO {
@@ -17,23 +16,14 @@ inline const char* const statelessEncodings[] = {"UTF-8",    "CESU-8",    "Shift
                                                  "UTF-16BE", "GB18030",   "ISO-8859-1", "US-ASCII",
                                                  "EUC-JP",   "Big5-HKSCS"};
 
-// Into a block that is certain to suffice: ICU's own string class, which lets its block grow, never
-// ends on some malformed SCSU.
-inline std::u16string unitsOf(const char* encoding, std::string_view bytes) {
-    UErrorCode status = U_ZERO_ERROR;
-    const icu::LocalUConverterPointer converter(ucnv_open(encoding, &status));
-    std::u16string units(64 + 8 * bytes.size(), u'\0');
-    const int length =
-        ucnv_toUChars(converter.getAlias(), units.data(), static_cast<int>(units.size()),
-                      bytes.data(), static_cast<int>(bytes.size()), &status);
-    if (U_FAILURE(status)) throw std::runtime_error(u_errorName(status));
-    units.resize(static_cast<std::size_t>(length));
-    return units;
+inline icu::UnicodeString unitsOf(const char* encoding, std::string_view bytes) {
+    return {bytes.data(), static_cast<int>(bytes.size()), encoding};
 }
 
 // ICU over the whole text, then pairs and lone surrogates to one U+001A.
 inline std::u16string decodedAtOnce(const char* encoding, std::string_view bytes) {
-    std::u16string units = unitsOf(encoding, bytes);
+    const icu::UnicodeString text = unitsOf(encoding, bytes);
+    std::u16string units(text.getBuffer(), static_cast<std::size_t>(text.length()));
     std::erase_if(units, [](char16_t unit) { return U16_IS_TRAIL(unit); });
     const auto isLead = [](char16_t unit) { return U16_IS_LEAD(unit); };
     std::replace_if(units.begin(), units.end(), isLead, u'\x1A');
