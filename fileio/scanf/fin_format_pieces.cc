@@ -75,7 +75,7 @@ unsigned long finFormatPieceCMATCH::scan(TcodnStream& input, OutputBuffer& resul
             break;
         }
         if (!accepts(oneChar.front())) {
-            input.Rewind(bytes);
+            input.giveBack(oneChar.front(), bytes);
             break;
         }
         matched = true;
@@ -153,7 +153,7 @@ unsigned long finFormatPieceLiteral::scan(TcodnStream& /*input*/, OutputBuffer& 
         std::size_t bytes = 0;
         if (source->GetNCodePoints(oneChar, 1, &bytes) == 0) return fail(0, failed, status);
         if (oneChar.front() != unit) {
-            source->Rewind(bytes);
+            source->giveBack(oneChar.front(), bytes);
             return fail(code::MatchingFailure, failed, status);
         }
     }

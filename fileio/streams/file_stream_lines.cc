@@ -145,7 +145,7 @@ int fileStream::completeTerminator(char16_t terminator, OutputBuffer& out) {
         append(out, next);
         return 2;
     }
-    Rewind(bytes);
+    giveBack(next, bytes);
     return 1;
 }
 

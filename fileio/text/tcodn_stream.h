@@ -5,6 +5,7 @@
 #include "fileio/streams/stream.h"
 
 #include <cstddef>
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -60,6 +61,10 @@ public:
 
     // Reads past breakable spaces.
     void SkipWhiteSpace();
+
+    // Makes the unit read last, which took so many bytes, the next one to be read: gives back the
+    // bytes, or keeps the unit when they made more than it, as ill-formed text does.
+    void giveBack(char16_t unit, std::size_t bytes);
 
     // Encodes and writes `n` units with one PutNElements. Returns `n` when every byte went out and
     // else 0; in an encoding of fixed size, the characters written. A high surrogate at the end is
@@ -118,7 +123,8 @@ private:
     std::string writeBytes;
     std::u16string asciiText;
     bool asciiTransparent = false;  // without state, and bytes of 7-bit ASCII stand for themselves
-    bool midCharacter = false;      // the converter holds part of what it has read
+    bool midCharacter = false;      // the converter, or the next member, holds what was read
+    std::optional<char16_t> unitGivenBack;
     detail::DirectForm directForm{};
     const detail::ByteTable* byteTable = nullptr;
 };

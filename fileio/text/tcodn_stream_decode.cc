@@ -55,13 +55,15 @@ unsigned long replacePairs(char16_t* units, unsigned long count) {
 }
 
 // Takes the second half of a pair out of the converter, whose first half filled the target. A
-// reset would do so too, but also forget the byte order and the shift state.
-void dropHeldUnit(UConverter* converter) {
+// reset would do so too, but also forget the byte order and the shift state. Returns whether the
+// converter still holds something.
+bool dropHeldUnit(UConverter* converter) {
     char16_t held;
     char16_t* target = &held;
     const char* nothing = "";
     UErrorCode status = U_ZERO_ERROR;
     ucnv_toUnicode(converter, &target, target + 1, &nothing, nothing, nullptr, false, &status);
+    return holdsBack(converter, status);
 }
 
 }  // namespace
@@ -125,10 +127,11 @@ unsigned long TcodnStream::GetNCodePoints(char16_t* out, unsigned long n,
     std::size_t unused = 0;
     std::size_t& consumed = bytesConsumed ? *bytesConsumed : unused;
     consumed = 0;
-#ifdef FILEIO_FAST_PATHS
-    unsigned long produced = detail::UnitsAhead(*this).takeUnits(out, n, consumed);
-#else
     unsigned long produced = 0;
+    if (unitGivenBack && n != 0) out[produced++] = *std::exchange(unitGivenBack, std::nullopt);
+#ifdef FILEIO_FAST_PATHS
+    else
+        produced = detail::UnitsAhead(*this).takeUnits(out, n, consumed);
 #endif
     Undecoded bytes;
     while (produced < n && !bytes.exhausted) {
@@ -141,6 +144,16 @@ unsigned long TcodnStream::GetNCodePoints(char16_t* out, unsigned long n,
     }
     if (bytes.count != 0 && Rewind(bytes.count)) consumed -= bytes.count;
     return produced;
+}
+
+// Bytes that go back while the converter keeps what it made of them would be read again and again.
+void TcodnStream::giveBack(char16_t unit, std::size_t bytes) {
+    if (bytes != 0 && !midCharacter) {
+        Rewind(bytes);
+        return;
+    }
+    unitGivenBack = unit;
+    midCharacter = true;
 }
 
 unsigned long TcodnStream::decode(Undecoded& bytes, char16_t* out, unsigned long room) {
@@ -185,7 +198,7 @@ unsigned long TcodnStream::convert(Undecoded& bytes, char16_t* out, unsigned lon
     bytes.exhausted = target == out && source == bytes.next;
     bytes.drop(static_cast<std::size_t>(source - bytes.next));
     auto units = static_cast<unsigned long>(target - out);
-    if (units != 0 && U16_IS_LEAD(target[-1])) dropHeldUnit(from);
+    if (units != 0 && U16_IS_LEAD(target[-1])) midCharacter = dropHeldUnit(from);
     if (!latinFixed) units = replacePairs(out, units);
     CheckStatus(status);
     return units;

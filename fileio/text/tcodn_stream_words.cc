@@ -60,7 +60,7 @@ unsigned long TcodnStream::GetString(OutputBuffer& buffer, long width, bool noLi
             *static_cast<char16_t*>(buffer.Allocate(room)) = unit;
             ++count;
         } else if (count != 0) {
-            Rewind(bytes);
+            giveBack(unit, bytes);
             break;
         }
     }
@@ -75,7 +75,7 @@ void TcodnStream::SkipWhiteSpace() {
 #endif
         if (GetNCodePoints(oneChar, 1, &bytes) == 0) return;
     } while (qzu_isbreakablespace(oneChar.front()));
-    Rewind(bytes);
+    giveBack(oneChar.front(), bytes);
 }
 
 }  // namespace Orvandeil::FileIO
