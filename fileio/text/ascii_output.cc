@@ -3,6 +3,7 @@
 #include "fileio/constants.h"
 #include "fileio/text/known_streams.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
@@ -99,7 +100,7 @@ void AsciiOutput::settle(const char* text, std::size_t count) {
         return;
     }
     if (unitBytes == 1) {
-        std::memcpy(string->cursor, text, count);
+        std::copy_n(text, count, string->cursor);
     } else {
         widenAscii(text, count, string->cursor);
     }
