@@ -152,7 +152,8 @@ NumberForm makeNumberForm(char conversion, PrintFormatFlags flags, int width, bo
     if (general && form.precision == 0) form.precision = 1;
     form.plainLimit = conversion == 'f' ? plainLimitOf(form.precision) : largestMagnitude;
     form.bare = !real && flags == NoFlags && width == 0 && !hasPrecision;
-    form.mostBytes = static_cast<std::size_t>(width + std::max(form.precision, 0)) +
+    form.mostBytes = static_cast<std::size_t>(width) +
+                     static_cast<std::size_t>(std::max(form.precision, 0)) +
                      (conversion == 'f' ? mostRealDigits : mostIntegerDigits) +
                      signPointAndExponent + writtenAhead;
     return form;
