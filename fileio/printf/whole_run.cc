@@ -129,7 +129,8 @@ void splitHexes(Run& run, bool upper) {
 }
 #endif
 
-// A short text, by a fixed number of bytes.
+// The text behind each number is copied by a fixed number of bytes, which a string of up to 15 has
+// in the object itself; those beyond its end are overwritten by what comes next.
 template <std::size_t textBytes>
 char* writeDecimals(char* out, const Run& run, const std::string& behind) {
     char text[textBytes];

@@ -130,8 +130,7 @@ unsigned long TcodnStream::GetNCodePoints(char16_t* out, unsigned long n,
     unsigned long produced = 0;
     if (unitGivenBack && n != 0) out[produced++] = *std::exchange(unitGivenBack, std::nullopt);
 #ifdef FILEIO_FAST_PATHS
-    else
-        produced = detail::UnitsAhead(*this).takeUnits(out, n, consumed);
+    if (produced == 0) produced = detail::UnitsAhead(*this).takeUnits(out, n, consumed);
 #endif
     Undecoded bytes;
     while (produced < n && !bytes.exhausted) {
