@@ -86,25 +86,33 @@ std::string printed(const std::vector<float>& values) {
     return text;
 }
 
-// Nine digits tell every single; all of them in a long run, else every 40,009th.
-TEST(Exhaustive, SinglesThroughPrintAndScan) {
+// Nine digits tell every single; all of them in a long run, else every 40,009th. In sixteen parts,
+// by sign and the upper bits of the exponent.
+class Singles : public testing::TestWithParam<std::uint64_t> {};
+
+std::vector<double> scanned(const std::string& text, std::size_t mostValues) {
+    inputStringStream in(text.c_str(), std::ssize(text), "");
+    finFormatParser parser(u"%f", &in);
+    parser.InitFormatPieces();
+    OutputBuffer buffer(parser.getResultClass(), mostValues, mostValues, mostValues);
+    unsigned long count = 0;
+    scanControl(0, true, count, in, parser, buffer).performMainScan();
+    const auto block = buffer.Transfer();
+    const auto* const found = static_cast<const double*>(block.get());
+    return {found, found + count};
+}
+
+TEST_P(Singles, ThroughPrintAndScan) {
     constexpr std::size_t pieceSize = 1 << 16;
     const std::uint64_t step = isLong() ? 1 : 40009;
+    const std::uint64_t first = GetParam() << 28, end = first + (1 << 28);
     std::vector<float> values;
-    for (std::uint64_t bits = 0; bits <= UINT32_MAX; bits += step) {
+    for (std::uint64_t bits = (first + step - 1) / step * step; bits < end; bits += step) {
         values.push_back(std::bit_cast<float>(static_cast<std::uint32_t>(bits)));
-        if (values.size() != pieceSize && bits + step <= UINT32_MAX) continue;
-        const std::string text = printed(values);
-        inputStringStream in(text.c_str(), std::ssize(text), "");
-        finFormatParser parser(u"%f", &in);
-        parser.InitFormatPieces();
-        OutputBuffer buffer(parser.getResultClass(), pieceSize, pieceSize, pieceSize);
-        unsigned long count = 0;
-        scanControl(0, true, count, in, parser, buffer).performMainScan();
-        ASSERT_EQ(count, values.size());
-        const auto block = buffer.Transfer();
-        const auto* const found = static_cast<const double*>(block.get());
-        for (std::size_t i = 0; i < count; ++i) {
+        if (values.size() != pieceSize && bits + step < end) continue;
+        const std::vector<double> found = scanned(printed(values), values.size());
+        ASSERT_EQ(found.size(), values.size());
+        for (std::size_t i = 0; i < values.size(); ++i) {
             const auto value = static_cast<float>(found[i]);
             const bool isSame = std::isnan(values[i]) ? std::isnan(value)
                                                       : std::bit_cast<std::uint32_t>(value) ==
@@ -114,6 +122,8 @@ TEST(Exhaustive, SinglesThroughPrintAndScan) {
         values.clear();
     }
 }
+
+INSTANTIATE_TEST_SUITE_P(Exhaustive, Singles, testing::Range<std::uint64_t>(0, 16));
 
 }  // namespace
 }  // namespace properties
