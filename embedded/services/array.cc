@@ -28,11 +28,23 @@ std::size_t checkedCount(const Dimensions& dimensions) {
     return count;
 }
 
-std::unique_ptr<vxArray> makeBare(vxClassID classID, std::string className, Dimensions dimensions) {
+std::unique_ptr<vxArray> makeBare(vxClassID classID, Dimensions dimensions) {
     auto array = std::make_unique<vxArray>();
     array->classID = classID;
-    array->className = std::move(className);
     array->dimensions = std::move(dimensions);
+    return array;
+}
+
+std::unique_ptr<ArrayContents> makeContents(std::string className) {
+    auto contents = std::make_unique<ArrayContents>();
+    contents->className = std::move(className);
+    return contents;
+}
+
+std::unique_ptr<vxArray> makeContainer(vxClassID classID, std::string className,
+                                       Dimensions dimensions) {
+    auto array = makeBare(classID, std::move(dimensions));
+    array->contents = makeContents(std::move(className));
     return array;
 }
 
@@ -42,6 +54,16 @@ std::unique_ptr<void, HostBlockDestroyer> copyBlock(const void* source, std::siz
     std::unique_ptr<void, HostBlockDestroyer> block(vxMemoryAllocateZeroedOrRaise(count, size));
     std::memcpy(block.get(), source, count * size);
     return block;
+}
+
+std::unique_ptr<ArrayContents> copyContents(const ArrayContents& contents) {
+    auto copy = makeContents(contents.className);
+    copy->texts = contents.texts;
+    for (const ArrayPtr& array : contents.arrays)
+        copy->arrays.push_back(copyOf(*array));
+    copy->fields = contents.fields;
+    copy->functions = contents.functions;
+    return copy;
 }
 
 }  // namespace
@@ -65,9 +87,10 @@ std::size_t elementCount(const vxArray& array) {
 }
 
 ArrayPtr makeNumeric(vxClassID classID, Dimensions dimensions, vxComplexity complexity) {
-    auto array = makeBare(classID, nameOfClass(classID), atLeastTwo(std::move(dimensions)));
-    const std::size_t count = checkedCount(array->dimensions);
     const std::size_t size = elementBytes(classID);
+    auto array = makeBare(classID, atLeastTwo(std::move(dimensions)));
+    const std::size_t count = checkedCount(array->dimensions);
+    if (size == 0) array->contents = makeContents(nameOfClass(classID));
     if (count > 0 && size > 0) array->real.reset(vxMemoryAllocateZeroedOrRaise(count, size));
     // An empty array may be complex, too.
     if (size > 0 && complexity == vxCOMPLEX) {
@@ -77,7 +100,7 @@ ArrayPtr makeNumeric(vxClassID classID, Dimensions dimensions, vxComplexity comp
 }
 
 ArrayPtr makeNumeric(vxClassID classID, Dimensions dimensions, void* block) {
-    auto array = makeBare(classID, nameOfClass(classID), atLeastTwo(std::move(dimensions)));
+    auto array = makeBare(classID, atLeastTwo(std::move(dimensions)));
     array->real.reset(block);
     return ArrayPtr(array.release());
 }
@@ -102,9 +125,9 @@ ArrayPtr makeChars(std::u16string_view text) {
 }
 
 ArrayPtr makeStrings(std::vector<StringElement> texts, Dimensions dimensions) {
-    auto array = makeBare(vxOBJECT_CLASS, "string", atLeastTwo(std::move(dimensions)));
+    auto array = makeContainer(vxOBJECT_CLASS, "string", atLeastTwo(std::move(dimensions)));
     texts.resize(checkedCount(array->dimensions));
-    array->texts = std::move(texts);
+    array->contents->texts = std::move(texts);
     return ArrayPtr(array.release());
 }
 
@@ -115,21 +138,18 @@ ArrayPtr makeString(StringElement text) {
 }
 
 ArrayPtr makeObject(std::string className, FunctionTable functions, Dimensions dimensions) {
-    auto array = makeBare(vxOBJECT_CLASS, std::move(className), atLeastTwo(std::move(dimensions)));
-    array->functions = std::move(functions);
+    auto array =
+        makeContainer(vxOBJECT_CLASS, std::move(className), atLeastTwo(std::move(dimensions)));
+    array->contents->functions = std::move(functions);
     return ArrayPtr(array.release());
 }
 
 ArrayPtr copyOf(const vxArray& array) {
-    auto copy = makeBare(array.classID, array.className, array.dimensions);
+    auto copy = makeBare(array.classID, array.dimensions);
     const std::size_t size = elementBytes(array.classID);
     copy->real = copyBlock(array.real.get(), elementCount(array), size);
     copy->imaginary = copyBlock(array.imaginary.get(), elementCount(array), size);
-    copy->texts = array.texts;
-    for (const ArrayPtr& content : array.contents)
-        copy->contents.push_back(copyOf(*content));
-    copy->fields = array.fields;
-    copy->functions = array.functions;
+    if (array.contents) copy->contents = copyContents(*array.contents);
     return ArrayPtr(copy.release());
 }
 
@@ -146,15 +166,16 @@ const void* imaginaryData(const vxArray& array) {
 }
 
 const vxArray* cellContent(const vxArray& cell) {
-    if (cell.classID != vxCELL_CLASS || cell.contents.empty()) return nullptr;
-    return cell.contents.front().get();
+    if (cell.classID != vxCELL_CLASS || cell.contents->arrays.empty()) return nullptr;
+    return cell.contents->arrays.front().get();
 }
 
 const vxArray* structField(const vxArray& structure, std::string_view name) {
-    const auto& fields = structure.fields;
+    if (structure.classID != vxSTRUCT_CLASS) return nullptr;
+    const auto& fields = structure.contents->fields;
     const auto found = std::find(fields.begin(), fields.end(), name);
     if (found == fields.end()) return nullptr;
-    return structure.contents[static_cast<std::size_t>(found - fields.begin())].get();
+    return structure.contents->arrays[static_cast<std::size_t>(found - fields.begin())].get();
 }
 
 }  // namespace Orvandeil::FileIO::embedded
@@ -177,18 +198,18 @@ vxArray* vxCreateCharRow(const char16_t* text, std::size_t length) {
 }
 
 vxArray* vxCreateCellScalar(vxArray* content) {
-    auto array = makeBare(vxCELL_CLASS, nameOfClass(vxCELL_CLASS), {1, 1});
-    array->contents.emplace_back();
-    array->contents.back().reset(content);
+    auto array = makeContainer(vxCELL_CLASS, nameOfClass(vxCELL_CLASS), {1, 1});
+    array->contents->arrays.emplace_back();
+    array->contents->arrays.back().reset(content);
     return array.release();
 }
 
 vxArray* vxCreateStructScalar(std::size_t count, const char* const* names, vxArray* const* values) {
-    auto array = makeBare(vxSTRUCT_CLASS, nameOfClass(vxSTRUCT_CLASS), {1, 1});
-    array->fields.assign(names, names + count);
-    array->contents.resize(count);
+    auto array = makeContainer(vxSTRUCT_CLASS, nameOfClass(vxSTRUCT_CLASS), {1, 1});
+    array->contents->fields.assign(names, names + count);
+    array->contents->arrays.resize(count);
     for (std::size_t i = 0; i < count; ++i)
-        array->contents[i].reset(values[i]);
+        array->contents->arrays[i].reset(values[i]);
     return array.release();
 }
 
@@ -215,7 +236,8 @@ vxClassID vxArrayClassID(const vxArray* array) {
 }
 
 const char* vxArrayClassName(const vxArray* array) {
-    return array->className.c_str();
+    if (!array->contents) return nameOfClass(array->classID);
+    return array->contents->className.c_str();
 }
 
 std::size_t vxArrayDimensionCount(const vxArray* array) {

@@ -14,6 +14,8 @@
 #include <string_view>
 #include <vector>
 
+#include <boost/container/small_vector.hpp>
+
 // Arrays of the embedded host, and the makers that its built-ins, the program and tests use.
 namespace Orvandeil::FileIO::embedded {
 
@@ -22,7 +24,7 @@ struct ArrayDestroyer {
 };
 using ArrayPtr = std::unique_ptr<vxArray, ArrayDestroyer>;
 
-using Dimensions = std::vector<std::size_t>;
+using Dimensions = boost::container::small_vector<std::size_t, 2>;
 // A text of a string array; no value: missing.
 using StringElement = std::optional<std::u16string>;
 

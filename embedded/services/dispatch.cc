@@ -40,15 +40,15 @@ std::size_t subscript(const vxArray& structure, std::size_t count) {
 
 ArrayPtr stringElement(Inputs inputs) {
     if (inputs.size() < 2) return nullptr;
-    const auto& texts = inputs[0]->texts;
+    const auto& texts = inputs[0]->contents->texts;
     return makeString(texts[subscript(*inputs[1], texts.size())]);
 }
 
 const StringElement& onlyText(Inputs inputs) {
-    if (inputs[0]->texts.size() != 1) {
+    if (inputs[0]->contents->texts.size() != 1) {
         vxErrMsgId(KESTRA::string::MustBeStringScalarOrCharacterVector());
     }
-    return inputs[0]->texts.front();
+    return inputs[0]->contents->texts.front();
 }
 
 ArrayPtr charsOfString(Inputs inputs) {
@@ -74,17 +74,9 @@ template <class T, vxClassID ClassID>
 ArrayPtr numbersOfStrings(Inputs inputs) {
     ArrayPtr numbers = makeNumeric(ClassID, inputs[0]->dimensions);
     T* out = static_cast<T*>(realData(*numbers));
-    for (const StringElement& text : inputs[0]->texts)
+    for (const StringElement& text : inputs[0]->contents->texts)
         *out++ = numberOf<T>(text);
     return numbers;
-}
-
-// Text is no integer: nothing applies, but what is missing is told so.
-ArrayPtr integerOfString(Inputs inputs) {
-    for (const StringElement& text : inputs[0]->texts) {
-        if (!text) vxErrMsgId(KESTRA::string::MissingNotSupported());
-    }
-    return nullptr;
 }
 
 template <class T>
@@ -136,8 +128,6 @@ constexpr Entry functions[] = {
     {"string", "string", sameAgain},
     {"double", "string", numbersOfStrings<double, vxDOUBLE_CLASS>},
     {"single", "string", numbersOfStrings<float, vxSINGLE_CLASS>},
-    {"int64", "string", integerOfString},
-    {"uint64", "string", integerOfString},
     {"char", "char", sameAgain},
     {"string", "char", stringOfChars},
     {"size", "", sizeOf},
@@ -154,9 +144,12 @@ ArrayPtr callOwn(const FunctionTable& table, std::string_view name, Inputs input
 ArrayPtr callFunction(std::string_view name, Inputs inputs) {
     if (inputs.empty()) return nullptr;
     const vxArray& first = *inputs[0];
-    if (first.functions) return callOwn(*first.functions, name, inputs);
+    if (first.contents && first.contents->functions) {
+        return callOwn(*first.contents->functions, name, inputs);
+    }
+    const std::string_view className = vxArrayClassName(&first);
     for (const Entry& entry : functions) {
-        const bool ofClass = entry.className.empty() || entry.className == first.className;
+        const bool ofClass = entry.className.empty() || entry.className == className;
         if (entry.function == name && ofClass) return entry.run(inputs);
     }
     return nullptr;
@@ -171,13 +164,14 @@ vxArray* vxDispatchCall(const char* name, const vxArray* const* inputs, std::siz
 }
 
 bool vxStringArrayIs(const vxArray* array) {
-    return array->classID == vxOBJECT_CLASS && array->className == "string" && !array->functions;
+    return array->classID == vxOBJECT_CLASS && array->contents->className == "string" &&
+           !array->contents->functions;
 }
 
 bool vxStringArrayIsMissing(const vxArray* array, std::size_t index) {
-    return !array->texts[index].has_value();
+    return !array->contents->texts[index].has_value();
 }
 
 std::u16string vxStringArrayText(const vxArray* array, std::size_t index) {
-    return array->texts[index].value();
+    return array->contents->texts[index].value();
 }
