@@ -5,6 +5,8 @@
 #include "embedded/builtins/binary_write.h"
 #include "embedded/builtins/positioning.h"
 #include "embedded/builtins/progress_line.h"
+#include "fileio/attributes/file_permission.h"
+#include "fileio/errors/code_list.h"
 
 #include <string>
 #include <utility>
@@ -13,6 +15,7 @@
 namespace cli {
 
 namespace embedded = Orvandeil::FileIO::embedded;
+namespace code = Orvandeil::FileIO::code;
 using Orvandeil::FileIO::MachineFormat;
 
 namespace {
@@ -37,6 +40,16 @@ void checkOptions(const CommandLine& line, const std::string& permission) {
     if (line.has("offset") && permission.find('+') == std::string::npos) {
         throw UsageError("--offset needs an update mode, such as --mode r+");
     }
+}
+
+// What is wrong with an offset whatever the file holds, while nothing is lost yet: an emptied file
+// ends where it begins.
+void checkOffset(double offset, const std::string& permission, std::string_view path) {
+    const std::string label(path);
+    const long whole = embedded::wholeOffset(offset, label);
+    if (whole < 0) throw embedded::CodeError(code::BadOffsetBeforeBegin, label);
+    const Orvandeil::FileIO::FilePermission mode(permission.c_str(), false);
+    if (whole > 0 && mode.write) throw embedded::CodeError(code::BadOffsetAfterEnd, label);
 }
 
 std::vector<Part> readParts(const CommandLine& line) {
@@ -79,6 +92,7 @@ void runWrite(const CommandLine& line, Report& report) {
     checkOptions(line, request.permission);
     const std::vector<Part> parts = readParts(line);
     const auto offset = byteOption(line, "offset");
+    if (offset) checkOffset(*offset, request.permission, line.operands()[0]);
     auto file = openOutput(line, request);
     if (offset) embedded::seek(*file, *offset, embedded::Origin::Begin);
     embedded::WriteResult total = writeParts(*file, parts);

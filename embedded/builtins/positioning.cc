@@ -13,16 +13,6 @@ int outside(double offset) {
     return offset < 0 ? code::BadOffsetBeforeBegin : code::BadOffsetAfterEnd;
 }
 
-long wholeOffset(const OpenFile& file, double offset) {
-    long whole = 0;
-    bool isNaN = false;
-    if (NumericAttr::GetInt64(offset, whole, &isNaN, nullptr)) return whole;
-    const bool isFraction = std::trunc(offset) != offset;
-    throw CodeError(file.failure(isNaN        ? code::BadOffsetNaN
-                                 : isFraction ? code::BadOffsetInt
-                                              : outside(offset)));
-}
-
 long moved(OpenFile& file, off_t offset, int whence) {
     const bool isMoved = fseeko(file.handle.get(), offset, whence) == 0;
     const long position = isMoved ? ftello(file.handle.get()) : -1;
@@ -32,9 +22,20 @@ long moved(OpenFile& file, off_t offset, int whence) {
 
 }  // namespace
 
+long wholeOffset(double offset, const std::string& label) {
+    long whole = 0;
+    bool isNaN = false;
+    if (NumericAttr::GetInt64(offset, whole, &isNaN, nullptr)) return whole;
+    const bool isFraction = std::trunc(offset) != offset;
+    throw CodeError(isNaN        ? code::BadOffsetNaN
+                    : isFraction ? code::BadOffsetInt
+                                 : outside(offset),
+                    label);
+}
+
 void seek(OpenFile& file, double offset, Origin origin) {
     if (file.stream->isScreen()) throw CodeError(file.failure(code::FseekFailed));
-    const long whole = wholeOffset(file, offset);
+    const long whole = wholeOffset(offset, file.label);
     if (file.carry().FseekHandleCarryByte() != 0) throw CodeError(carryFailure(file));
     const long current = moved(file, 0, SEEK_CUR);
     // Asked of the file itself, so that what is still buffered counts.
@@ -44,6 +45,7 @@ void seek(OpenFile& file, double offset, Origin origin) {
     const bool tooFar = __builtin_add_overflow(base, whole, &target);
     const bool isInside = !tooFar && target >= 0 && target <= end;
     moved(file, isInside ? target : current, SEEK_SET);
+    if (isInside) file.stream->forgetUnread();
     file.direction = Direction::None;
     if (isInside) return;
     throw CodeError(file.failure(!tooFar && target < 0 ? code::BadOffsetBeforeBegin

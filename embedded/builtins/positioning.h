@@ -13,6 +13,9 @@ enum class Origin { Begin, Current, End };
 // NaN, -28 for a fraction, -26 and -27 before the beginning and after the end (infinities
 // included), -31 when the bits cannot be settled, -33 when the file cannot be positioned.
 void seek(OpenFile& file, double offset, Origin origin);
+// The part of that which needs no file: the offset as a whole number of bytes, for messages about
+// `label`.
+long wholeOffset(double offset, const std::string& label);
 // To the beginning. Ends the end of the file; a recorded error stays.
 void rewind(OpenFile& file);
 

@@ -60,6 +60,7 @@ int fileStream::setPosition(long position) {
     errno = 0;
     const int status = fseeko(file, position, SEEK_SET);
     if (status != 0) recordFailure();
+    if (status == 0) forgetUnread();
     return status;
 }
 
@@ -75,6 +76,8 @@ unsigned long fileStream::GetNElements(unsigned long count, char* buffer,
     // Counted in elements whatever their size, on purpose.
     if (total != 0) lastByteRead = static_cast<unsigned char>(buffer[total - 1]);
     recentBytes.add(buffer, total * elementSize);
+    // How much of an incomplete element was read is not known.
+    if (total < count && elementSize > 1) recentBytes.clear();
     return total;
 }
 

@@ -1,18 +1,14 @@
 #include "fileio/text/input_string_stream.h"
 
 #include "fileio/constants.h"
+#include "fileio/text/owned_converter.h"
 
 #include <algorithm>
 #include <cstdint>
 #include <cstring>
-#include <memory>
 
 namespace Orvandeil::FileIO {
 namespace {
-
-struct CloseConverter {
-    void operator()(UConverter* converter) const { ucnv_close(converter); }
-};
 
 // Decodes the next piece only to count its units. The text's last piece is its flush.
 unsigned long countUnits(UConverter* converter, const char*& next, const char* end) {
@@ -102,7 +98,7 @@ unsigned long inputStringStream::getUTF16Position() {
 unsigned long inputStringStream::countUTF16(const char* next) {
     // A converter of its own: what the reading one holds back belongs to the next read.
     UErrorCode status = U_ZERO_ERROR;
-    const std::unique_ptr<UConverter, CloseConverter> counter(ucnv_clone(GetConv(0), &status));
+    const detail::OwnedConverter counter(ucnv_clone(GetConv(0), &status));
     if (U_FAILURE(status)) {
         CheckStatus(status);
         return 0;

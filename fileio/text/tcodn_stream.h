@@ -63,8 +63,12 @@ public:
     void SkipWhiteSpace();
 
     // Makes the unit read last, which took so many bytes, the next one to be read: gives back the
-    // bytes, or keeps the unit when they made more than it, as ill-formed text does.
+    // bytes, or keeps the unit when it was not made of them alone, as in ill-formed text of some
+    // encodings.
     void giveBack(char16_t unit, std::size_t bytes);
+
+    // Forgets what was decoded and not read: for whoever moves the data without this stream.
+    void forgetUnread();
 
     // Encodes and writes `n` units with one PutNElements. Returns `n` when every byte went out and
     // else 0; in an encoding of fixed size, the characters written. A high surrogate at the end is
@@ -106,6 +110,7 @@ private:
     unsigned long decode(Undecoded& bytes, char16_t* out, unsigned long room);
     unsigned long convert(Undecoded& bytes, char16_t* out, unsigned long room, UConverter* from);
     bool readsInPieces() const;
+    bool hasState() const;
     bool takeWord(OutputBuffer& buffer, long width, long& count);
     bool takeBlanks();
     unsigned long decodeInto(OutputBuffer& buffer, std::size_t& room, std::size_t& bytesConsumed);
@@ -123,8 +128,10 @@ private:
     std::string writeBytes;
     std::u16string asciiText;
     bool asciiTransparent = false;  // without state, and bytes of 7-bit ASCII stand for themselves
-    bool midCharacter = false;      // the converter, or the next member, holds what was read
+    bool midCharacter = false;      // one of the next two holds what was read
+    bool converterHolds = false;
     std::optional<char16_t> unitGivenBack;
+    bool begunMidCharacter = false;  // the last read of units
     detail::DirectForm directForm{};
     const detail::ByteTable* byteTable = nullptr;
 };

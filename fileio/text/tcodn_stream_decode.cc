@@ -3,6 +3,7 @@
 #include "fileio/text/conversion_size_error.h"
 #include "fileio/text/direct_transcoding.h"
 #include "fileio/text/input_string_stream.h"
+#include "fileio/text/owned_converter.h"
 #include "fileio/text/tcodn_stream.h"
 #include "fileio/text/units_ahead.h"
 
@@ -38,10 +39,28 @@ constexpr std::size_t largestConversion = 0x3FFFFFFD;
 constexpr std::size_t smallestConversion = 128;
 #endif
 
-// Whether the converter keeps bytes or units back for its next call.
-bool holdsBack(const UConverter* converter, UErrorCode status) {
-    UErrorCode ignored = U_ZERO_ERROR;
-    return status == U_BUFFER_OVERFLOW_ERROR || ucnv_toUCountPending(converter, &ignored) != 0;
+// Makes one unit, if there is one, of what the converter holds. At the end of the text an
+// incomplete character is one, too.
+UErrorCode takeHeldUnit(UConverter* converter, bool atEnd, char16_t*& target) {
+    const char* nothing = "";
+    UErrorCode status = U_ZERO_ERROR;
+    ucnv_toUnicode(converter, &target, target + 1, &nothing, nothing, nullptr, atEnd, &status);
+    return status;
+}
+
+// Whether the converter keeps bytes or units back for its next call. A full target may mean no more
+// than that the source was longer. In an encoding without state a copy can be asked: what there is
+// shows at the end of the text.
+bool holdsBack(const UConverter* converter, UErrorCode status, bool hasState) {
+    UErrorCode failure = U_ZERO_ERROR;
+    if (ucnv_toUCountPending(converter, &failure) != 0) return true;
+    if (status != U_BUFFER_OVERFLOW_ERROR || hasState) return status == U_BUFFER_OVERFLOW_ERROR;
+    const detail::OwnedConverter copy(ucnv_clone(converter, &failure));
+    if (U_FAILURE(failure)) return true;
+    char16_t unit;
+    char16_t* target = &unit;
+    takeHeldUnit(copy.get(), true, target);
+    return target != &unit;
 }
 
 // Each pair becomes the one unit U+001A. So does a high surrogate without its partner; a low one
@@ -57,13 +76,10 @@ unsigned long replacePairs(char16_t* units, unsigned long count) {
 // Takes the second half of a pair out of the converter, whose first half filled the target. A
 // reset would do so too, but also forget the byte order and the shift state. Returns whether the
 // converter still holds something.
-bool dropHeldUnit(UConverter* converter) {
+bool dropHeldUnit(UConverter* converter, bool hasState) {
     char16_t held;
     char16_t* target = &held;
-    const char* nothing = "";
-    UErrorCode status = U_ZERO_ERROR;
-    ucnv_toUnicode(converter, &target, target + 1, &nothing, nothing, nullptr, false, &status);
-    return holdsBack(converter, status);
+    return holdsBack(converter, takeHeldUnit(converter, false, target), hasState);
 }
 
 }  // namespace
@@ -128,7 +144,11 @@ unsigned long TcodnStream::GetNCodePoints(char16_t* out, unsigned long n,
     std::size_t& consumed = bytesConsumed ? *bytesConsumed : unused;
     consumed = 0;
     unsigned long produced = 0;
-    if (unitGivenBack && n != 0) out[produced++] = *std::exchange(unitGivenBack, std::nullopt);
+    begunMidCharacter = midCharacter;
+    if (unitGivenBack && n != 0) {
+        out[produced++] = *std::exchange(unitGivenBack, std::nullopt);
+        midCharacter = converterHolds;
+    }
 #ifdef FILEIO_FAST_PATHS
     if (produced == 0) produced = detail::UnitsAhead(*this).takeUnits(out, n, consumed);
 #endif
@@ -145,14 +165,35 @@ unsigned long TcodnStream::GetNCodePoints(char16_t* out, unsigned long n,
     return produced;
 }
 
-// Bytes that go back while the converter keeps what it made of them would be read again and again.
+// Bytes that go back are decoded again. That makes the same unit if it was made of them alone, by a
+// converter that remembers nothing else.
 void TcodnStream::giveBack(char16_t unit, std::size_t bytes) {
-    if (bytes != 0 && !midCharacter) {
-        Rewind(bytes);
+    if (bytes == 0 || begunMidCharacter || (converterHolds && hasState())) {
+        unitGivenBack = unit;
+        midCharacter = true;
         return;
     }
-    unitGivenBack = unit;
-    midCharacter = true;
+    Rewind(bytes);
+    forgetUnread();
+}
+
+// Whether what bytes mean depends on those before them, a byte order mark for example.
+bool TcodnStream::hasState() const {
+    return directForm == detail::DirectForm::None;
+}
+
+// Encodings with state keep theirs.
+void TcodnStream::forgetUnread() {
+    unitGivenBack.reset();
+    if (converterHolds && !hasState()) ucnv_resetToUnicode(converter);
+    char16_t unit;
+    char16_t* target;
+    do {
+        target = &unit;
+        if (converterHolds) takeHeldUnit(converter, false, target);
+    } while (target != &unit);
+    converterHolds = false;
+    midCharacter = false;
 }
 
 unsigned long TcodnStream::decode(Undecoded& bytes, char16_t* out, unsigned long room) {
@@ -189,7 +230,7 @@ unsigned long TcodnStream::convert(Undecoded& bytes, char16_t* out, unsigned lon
     const char16_t* const targetEnd = out + std::min(room, constants::converterPieceBytes);
     UErrorCode status = U_ZERO_ERROR;
     ucnv_toUnicode(from, &target, targetEnd, &source, sourceEnd, nullptr, bytes.endOfData, &status);
-    midCharacter = holdsBack(from, status);
+    midCharacter = converterHolds = holdsBack(from, status, hasState());
     // A full target is how a round ends, and no failure.
     if (status == U_BUFFER_OVERFLOW_ERROR && target == targetEnd) status = U_ZERO_ERROR;
     if (U_FAILURE(status) && bytes.bytesRead > largestConversion) throw ConversionSizeError();
@@ -197,7 +238,8 @@ unsigned long TcodnStream::convert(Undecoded& bytes, char16_t* out, unsigned lon
     bytes.exhausted = target == out && source == bytes.next;
     bytes.drop(static_cast<std::size_t>(source - bytes.next));
     auto units = static_cast<unsigned long>(target - out);
-    if (units != 0 && U16_IS_LEAD(target[-1])) midCharacter = dropHeldUnit(from);
+    if (units != 0 && U16_IS_LEAD(target[-1]))
+        midCharacter = converterHolds = dropHeldUnit(from, hasState());
     if (!latinFixed) units = replacePairs(out, units);
     CheckStatus(status);
     return units;

@@ -40,6 +40,7 @@ public:
         if (ahead.empty() || static_cast<signed char>(ahead.front()) < 0) return false;
         const auto byte = static_cast<unsigned char>(ahead.front());
         unit = byte;
+        stream.begunMidCharacter = false;
         file->lastByteRead = byte;
         file->recentBytes.add(byte);
         takeReadAhead(file->file, ahead.data() + 1);

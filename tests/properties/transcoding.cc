@@ -24,7 +24,7 @@ std::u16string decodedInSteps(Bytes& input, const char* encoding, std::string_vi
         const unsigned long start = stream.position();
         stream.GetNCodePoints(part, step, &consumed);
         if (consumed != stream.position() - start) throw Broken("miscounted bytes");
-        const auto units = unitsOf(encoding, bytes.substr(0, stream.position())).length();
+        const auto units = unitsOf(encoding, bytes.substr(0, stream.position())).size();
         requireEqual(std::to_string(stream.getUTF16Position()), std::to_string(units), encoding);
         all += part;
     } while (part.size() == step);

@@ -217,6 +217,19 @@ TEST(FileStream, TellsAboutTheFile) {
     EXPECT_FALSE(fileStream(nullptr, "", without.permission, u"").isFileOpen());
 }
 
+// The converter makes two units of the last two bytes, of which one is not taken.
+TEST(FileStream, ForgetsWhatWasNotReadWhenItIsPositioned) {
+    const TempFile file("a\x81\x30\x81 5");
+    OpenedFile opened(file.path(), "r", "GB18030");
+    std::u16string units;
+    for (const int taken : {2, 3, 2}) {
+        opened.stream.GetNCodePoints(units, static_cast<unsigned long>(taken), nullptr);
+        EXPECT_EQ(units.substr(0, 2), u"a\uFFFD");
+        opened.stream.giveBack(units.back(), 0);
+        EXPECT_EQ(opened.stream.setPosition(0), 0);
+    }
+}
+
 TEST(FileStream, WarnsOfUnsupportedEncodings) {
     const TempFile file("abc");
     const embedded::WithdrawnEncoding first("macintosh");

@@ -7,7 +7,6 @@
 #include <string_view>
 #include <vector>
 
-#include <unicode/unistr.h>
 #include <unicode/utf16.h>
 
 namespace Orvandeil::FileIO {
@@ -16,14 +15,24 @@ inline const char* const statelessEncodings[] = {"UTF-8",    "CESU-8",    "Shift
                                                  "UTF-16BE", "GB18030",   "ISO-8859-1", "US-ASCII",
                                                  "EUC-JP",   "Big5-HKSCS"};
 
-inline icu::UnicodeString unitsOf(const char* encoding, std::string_view bytes) {
-    return {bytes.data(), static_cast<int>(bytes.size()), encoding};
+// ICU over the whole text, by one call: its string class asks again and again of a converter that
+// fails on some texts (BOCU-1), and for ever.
+inline std::u16string unitsOf(const char* encoding, std::string_view bytes) {
+    UErrorCode status = U_ZERO_ERROR;
+    UConverter* const converter = ucnv_open(encoding, &status);
+    std::u16string units(8 * bytes.size() + 64, u'\0');
+    char16_t* end = units.data();
+    const char* next = bytes.data();
+    ucnv_toUnicode(converter, &end, end + units.size(), &next, next + bytes.size(), nullptr, true,
+                   &status);
+    ucnv_close(converter);
+    units.resize(static_cast<std::size_t>(end - units.data()));
+    return units;
 }
 
-// ICU over the whole text, then pairs and lone surrogates to one U+001A.
+// The same, then pairs and lone surrogates to one U+001A.
 inline std::u16string decodedAtOnce(const char* encoding, std::string_view bytes) {
-    const icu::UnicodeString text = unitsOf(encoding, bytes);
-    std::u16string units(text.getBuffer(), static_cast<std::size_t>(text.length()));
+    std::u16string units = unitsOf(encoding, bytes);
     std::erase_if(units, [](char16_t unit) { return U16_IS_TRAIL(unit); });
     const auto isLead = [](char16_t unit) { return U16_IS_LEAD(unit); };
     std::replace_if(units.begin(), units.end(), isLead, u'\x1A');
