@@ -58,7 +58,8 @@ void runExplain(const CommandLine& line, Report& report) {
 }
 
 int readCode(std::string_view text) {
-    const std::string_view digits = text.starts_with('+') ? text.substr(1) : text;
+    const bool hasPlus = text.starts_with('+') && !text.starts_with("+-");
+    const std::string_view digits = hasPlus ? text.substr(1) : text;
     const char* const end = digits.data() + digits.size();
     int code = 0;
     const auto result = std::from_chars(digits.data(), end, code);

@@ -27,6 +27,9 @@ void checkOptions(const CommandLine& line) {
     if (line.has("encoding") && !toFile && !line.has("json")) {
         throw UsageError("--encoding needs -o FILE or --json; the console is UTF-8");
     }
+    if (line.value("output") == "-" && line.has("json")) {
+        throw UsageError("--json does not go with standard output");
+    }
     if (line.has("raw") && line.has("strict-escapes")) {
         throw UsageError("--strict-escapes and --raw exclude each other");
     }

@@ -62,7 +62,8 @@ void runRead(const CommandLine& line, Report& report) {
 
 constexpr Option options[] = {
     {"precision", 0, "TEXT", "the elements and what becomes of them, default uint8=>double"},
-    {"size", 0, "VALUE", "how many elements, default Inf; [M N] and [M Inf] give M rows"},
+    {"size", 0, "VALUE",
+     "how many elements, default Inf; [M N] and [M Inf] give M rows, one row a column"},
     {"skip", 0, "VALUE", "bytes to leave out after each block, default 0"},
     {"machine-format", 0, "NAME", "the byte order: native (default), little-endian, big-endian"},
     {"offset", 0, "BYTES", "where to begin"},
@@ -74,7 +75,7 @@ constexpr char details[] =
     "FILE - is standard input. A precision is [N*]SOURCE[=>TARGET], or *SOURCE to keep the type:\n"
     "  int8 to int64, uint8 to uint64, single, double, logical, char (text), char*1 (bytes)\n"
     "  bitN, ubitN       fields of N bits, signed and unsigned; bitNinM with M bits for each\n"
-    "  TARGET noconvert  delivers the file's own type\n"
+    "  TARGET noconvert  delivers the file's own type; --size counts bytes then\n"
     "Blocks are of N elements. `fileio explain precision TEXT` tells what a text means.\n";
 
 }  // namespace

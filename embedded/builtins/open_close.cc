@@ -1,14 +1,17 @@
 #include "embedded/builtins/open_close.h"
 
 #include "embedded/builtins/spool.h"
+#include "fileio/constants.h"
 #include "fileio/errors/code_list.h"
 #include "fileio/host/text.h"
 #include "fileio/text/output_screen_stream.h"
 #include "fileio/text/output_string_stream.h"
 #include "fileio/text/std_err_stream.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <utility>
+#include <vector>
 
 #include <sys/stat.h>
 
@@ -46,6 +49,28 @@ std::unique_ptr<OpenFile> withFileStream(std::unique_ptr<OpenFile> file,
     return file;
 }
 
+// Of 7-bit text detection can only guess, and what is written behind it shall not be lost in an
+// encoding that has no place for it.
+bool holdsOnlyAscii(const std::string& name) {
+    const FileHandle file(std::fopen(name.c_str(), "r"));
+    if (!file) return false;
+    std::vector<char> piece(constants::transferPieceBytes);
+    while (const std::size_t count = std::fread(piece.data(), 1, piece.size(), file.get())) {
+        const auto isOther = [](char byte) { return (byte & 0x80) != 0 || byte == 0; };
+        if (std::any_of(piece.data(), piece.data() + count, isOther)) return false;
+    }
+    return std::ferror(file.get()) == 0;
+}
+
+std::string encodingFor(const std::string& name, const OpenFile& file, const OpenRequest& request) {
+    struct stat status = {};
+    const bool isGrowing = (file.permission.append || file.permission.update) &&
+                           !file.permission.write && request.encoding.empty() &&
+                           fstat(fileno(file.handle.get()), &status) == 0 &&
+                           S_ISREG(status.st_mode);
+    return isGrowing && holdsOnlyAscii(name) ? "UTF-8" : request.encoding;
+}
+
 std::u16string nameByDescriptor(const OpenFile& file) {
     const std::string path = "/dev/fd/" + std::to_string(fileno(file.handle.get()));
     return vxTextFromNarrow(path.data(), path.size());
@@ -78,7 +103,8 @@ std::unique_ptr<OpenFile> openFile(const std::string& name, const OpenRequest& r
     auto file = std::make_unique<OpenFile>(name, std::move(handle), permission, format);
     refuseDirectory(*file);
     std::u16string streamName = nameFromPath(name, *file);
-    file = withFileStream(std::move(file), request.encoding, std::move(streamName));
+    const std::string encoding = encodingFor(name, *file, request);
+    file = withFileStream(std::move(file), encoding, std::move(streamName));
     // An emptied file shows its encoding now. Later, what is written first could be taken for it.
     if (permission.write) file->stream->GetConv(0);
     return file;

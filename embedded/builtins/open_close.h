@@ -12,12 +12,15 @@ namespace Orvandeil::FileIO::embedded {
 struct OpenRequest {
     std::string permission = "r";
     std::string machineFormat = "native";
-    std::string encoding;  // empty: detected when it is needed; UTF-8 for an emptied file
+    // Empty: detected when it is needed; UTF-8 for an emptied file, and for one of 7-bit text that
+    // is written on.
+    std::string encoding;
 };
 
 // Opens a file by its name in bytes. Permission, machine format and encoding are validated in this
 // order, with the errors that they raise, before the file is touched. CodeError with the errno of a
-// failed open; a directory is refused.
+// failed open; a directory is refused. A pipe that is read from is first copied to an anonymous
+// file.
 std::unique_ptr<OpenFile> openFile(const std::string& name, const OpenRequest& request);
 
 // Standard input. One that cannot seek is first copied to an anonymous file. CodeError when it

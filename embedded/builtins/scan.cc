@@ -26,18 +26,35 @@ void padWithZeros(OutputBuffer& values, std::size_t missing) {
     std::memset(padding, 0, missing * values.GetTypeSize());
 }
 
-// Unlike a binary read, a scan never drops rows that were asked for.
-ArrayPtr shaped(OutputBuffer& values, const SizeAttribute& size) {
+struct Shape {
+    std::size_t rows;
+    std::size_t columns;
+};
+
+// Pads the last column. Unlike a binary read, a scan never drops rows that were asked for.
+Shape padTo(std::size_t rows, OutputBuffer& values) {
     const std::size_t count = values.GetSize();
-    if (count == 0) return ArrayPtr(values.TransferArray());
-    const std::size_t vectorRows = values.GetClassID() == vxCHAR_CLASS ? 1 : count;
-    const std::size_t rows = size.isMatrix ? size.m : vectorRows;
     const std::size_t columns = (count - 1) / rows + 1;
-    padWithZeros(values, rows * columns - count);
-    ArrayPtr array(values.TransferArray());
-    vxArraySetRows(array.get(), rows);
-    vxArraySetColumns(array.get(), columns);
-    return array;
+    std::size_t wanted = 0;
+    if (__builtin_mul_overflow(rows, columns, &wanted)) vxMemoryRaiseExhausted();
+    padWithZeros(values, wanted - count);
+    return {rows, columns};
+}
+
+// Without memory for a matrix the values are delivered as a vector.
+void deliver(OutputBuffer& values, const SizeAttribute& size, ScanResult& result) {
+    const std::size_t count = values.GetSize();
+    const bool isRow = values.GetClassID() == vxCHAR_CLASS;
+    Shape shape = isRow ? Shape{1, count} : Shape{count, 1};
+    try {
+        if (size.isMatrix && count != 0) shape = padTo(size.m, values);
+    } catch (const OutOfMemoryError&) {
+        result.code = code::NoMemory;
+    }
+    result.array.reset(values.TransferArray());
+    if (count == 0) return;
+    vxArraySetRows(result.array.get(), shape.rows);
+    vxArraySetColumns(result.array.get(), shape.columns);
 }
 
 ScanResult scanStream(TcodnStream& stream, const std::u16string& format,
@@ -55,7 +72,7 @@ ScanResult scanStream(TcodnStream& stream, const std::u16string& format,
         // One field too long for the memory leaves the values before it.
         result.code = code::NoMemory;
     }
-    result.array = shaped(values, size);
+    deliver(values, size, result);
     return result;
 }
 

@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <dlfcn.h>
 #include <memory>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -51,6 +52,14 @@ public:
     decltype(&ucsdet_getName) getName = find<decltype(ucsdet_getName)>(NAME_OF(ucsdet_getName));
 };
 
+// The detector tells visual order by a suffix that no converter knows.
+std::string converterName(std::string_view detected) {
+    for (const std::string_view suffix : {"_rtl", "_ltr"}) {
+        if (detected.ends_with(suffix)) detected.remove_suffix(suffix.size());
+    }
+    return std::string(detected);
+}
+
 struct ConverterCloser {
     void operator()(UConverter* converter) const noexcept { ucnv_close(converter); }
 };
@@ -88,5 +97,5 @@ std::string vxTextDetectCharset(const char* bytes, std::size_t count, vxConsoleS
     library.setText(detector.get(), bytes, length, &status);
     const UCharsetMatch* const match = library.detect(detector.get(), &status);
     const char* const name = match ? library.getName(match, &status) : nullptr;
-    return U_SUCCESS(status) && name ? name : "UTF-8";
+    return U_SUCCESS(status) && name ? converterName(name) : "UTF-8";
 }

@@ -97,6 +97,7 @@ private:
     void* keepConverted(void* end);
     void* takeBlock(std::size_t elements);
     char* joinChunks(std::size_t bytes);
+    vxArray* emptied(vxArray* array);
     void fillArray(vxArray* array, std::size_t elements);
 
     std::size_t minChunk;

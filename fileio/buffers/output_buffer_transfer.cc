@@ -48,7 +48,7 @@ void OutputBuffer::FreeMem(void* block) noexcept {
 vxArray* OutputBuffer::TransferArray() {
     const std::size_t count = GetSize();
     detail::OwnedArray array = makeEmptyArray(classID);
-    if (count == 0) return array.release();
+    if (count == 0) return emptied(array.release());
     if (classID != vxCHAR_CLASS) vxArraySetRows(array.get(), 1);
     vxArraySetColumns(array.get(), count);
     if (classID == vxCHAR_CLASS) vxArraySetRows(array.get(), 1);
@@ -59,13 +59,21 @@ vxArray* OutputBuffer::TransferArray() {
 vxArray* OutputBuffer::TransferArray(const SizeAttribute& size, bool countInBytes) {
     const std::size_t count = GetSize();
     detail::OwnedArray array = makeEmptyArray(classID);
-    if (count == 0) return array.release();
+    if (count == 0) return emptied(array.release());
     const std::size_t rows = rowsFor(size, count, classID);
     const Shape shape = shapeFor(rows, count, countInBytes ? rows * typeSize : rows);
     vxArraySetColumns(array.get(), shape.columns);
     vxArraySetRows(array.get(), shape.rows);
     fillArray(array.get(), shape.rows * shape.columns);
     return array.release();
+}
+
+// What chunks there are have no elements.
+vxArray* OutputBuffer::emptied(vxArray* array) {
+    for (void* const chunk : chunks)
+        vxMemoryFree(chunk);
+    Clear();
+    return array;
 }
 
 // A shape counted in bytes may have fewer elements than there are; the block keeps them all.

@@ -50,7 +50,7 @@ void foutFormatPieceForOUXbt<U, F>::printByType(TcodnStream* out, printfArgument
     *end = '\0';
 
     if (out->needsBufferSize()) {
-        const auto total = static_cast<unsigned long>(end - text.get());
+        const auto total = static_cast<unsigned long>(end - text.get()) + 1;
         out->setBufferSize(std::max(total, static_cast<unsigned long>(width.getEffective())) + 1);
     }
     printField(out, isLeftJustified() ? "%-*s" : "%*s", width.getEffective(), text.get());

@@ -39,11 +39,8 @@ void printfArgumentSource::setupArg() {
         clearArg();
         dims = objectDimensions(array);
     } else {
-        const std::size_t count = vxArrayDimensionCount(array);
         const std::size_t* const lengths = vxArrayDimensions(array);
-        dims.clear();
-        for (std::size_t i = 0; i < count; ++i)
-            dims.push_back(lengths[i]);
+        dims.assign(lengths, lengths + vxArrayDimensionCount(array));
     }
     argLength = detail::elementCount(std::span(dims.data(), dims.size()));
     data.emplace(array);
@@ -264,6 +261,7 @@ void printfMatrixArgumentSource::resetRow() {
 }
 
 std::size_t printfMatrixArgumentSource::columnCount() const {
+    if (dims.empty()) return 0;
     return detail::elementCount(std::span(dims.data(), dims.size()).subspan(1));
 }
 

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "fileio/export.h"
+#include "fileio/memory_operation_overloads.h"
 
 #include <cstdarg>
 #include <string>
@@ -12,7 +13,7 @@ namespace Orvandeil::FileIO {
 // A source or sink of bytes: an open file, a text in memory, the console. No operation throws for
 // an I/O failure: it returns a short count or a status and records the cause in the error code.
 // The order of the virtual operations is part of the binary interface.
-class FILEIO_API stream : private boost::noncopyable {
+class FILEIO_API stream : public fiMemoryOperationOverloads, private boost::noncopyable {
 public:
     stream() = default;
     virtual ~stream();
