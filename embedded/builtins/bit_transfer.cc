@@ -53,7 +53,7 @@ void unpackFields(const FieldRun& run, std::size_t place, unsigned long count, v
     if constexpr (sizeof(T) <= sizeof(std::uint32_t)) {
         const unsigned long done =
             detail::hasAvx2 ? unpackVectors(std::span(run.bytes), place, run.layout, count, out)
-                              : 0;
+                            : 0;
         place += done * run.stride();
         count -= done;
         out += done;
