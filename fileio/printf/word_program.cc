@@ -4,35 +4,11 @@
 #include "fileio/printf/fout_format_pieces.h"
 #include "fileio/text/ascii_output.h"
 
-#include <algorithm>
-#include <array>
 #include <cstring>
 #include <typeinfo>
 #include <utility>
 
 namespace Orvandeil::FileIO::detail {
-namespace {
-
-// Texts whose arrays are asked for together, so that the processor waits for memory once for many.
-using Words = std::array<std::u16string_view, 16>;
-
-// The texts of the first arguments, as far as they are char arrays: how many. Not of the last
-// argument, nor of one in front of an object: the step to an object may raise, which comes before
-// the text in front of it is written.
-std::size_t gatherWords(std::span<const vxArray* const> arguments, Words& words) {
-    const std::size_t most = std::min(arguments.size() - 1, words.size());
-    vxClassID nextClass = vxArrayClassID(arguments.front());
-    for (std::size_t i = 0; i < most; ++i) {
-        const vxClassID classID = std::exchange(nextClass, vxArrayClassID(arguments[i + 1]));
-        if (classID != vxCHAR_CLASS || nextClass == vxOBJECT_CLASS) return i;
-        const auto* const text = static_cast<const char16_t*>(vxArrayData(arguments[i]));
-        __builtin_prefetch(text);
-        words[i] = {text, elementCount(arguments[i])};
-    }
-    return most;
-}
-
-}  // namespace
 
 WordProgram::WordProgram(Pieces formatPieces, TcodnStream& out)
     : pieces(formatPieces), string(nullptr) {
@@ -72,28 +48,27 @@ void WordProgram::copyPass(std::u16string_view word, char16_t* out) const {
     }
 }
 
-void WordProgram::printPass(std::u16string_view word, AsciiOutput& output,
-                            foutFormatPiece*& current) const {
-    if (char16_t* const out = output.takeUnits(word.size() + literalUnits)) {
-        return copyPass(word, out);
-    }
-    for (std::size_t i = 0; i < pieces.size(); ++i) {
-        current = pieces[i];
-        put(literals[i].empty() ? word : literals[i]);
-    }
-}
-
 void WordProgram::run(printfArgumentSource& source, foutFormatPiece*& current) const {
     AsciiOutput output(*string);
     const std::span<const vxArray* const> arguments = source.wholeArguments();
     std::size_t done = 0;
+    vxClassID nextClass = arguments.empty() ? vxUNKNOWN_CLASS : vxArrayClassID(arguments.front());
     while (done + 1 < arguments.size()) {
-        Words words;
-        const std::size_t count = gatherWords(arguments.subspan(done), words);
-        if (count == 0) break;
-        for (const std::u16string_view word : std::span(words).first(count))
-            printPass(word, output, current);
-        done += count;
+        const vxArray* const array = arguments[done];
+        const vxClassID classID = std::exchange(nextClass, vxArrayClassID(arguments[done + 1]));
+        // The step to an object may raise, which comes before the text in front of it is written.
+        if (classID != vxCHAR_CLASS || nextClass == vxOBJECT_CLASS) break;
+        const auto* const text = static_cast<const char16_t*>(vxArrayData(array));
+        const std::size_t length = elementCount(array);
+        if (char16_t* const out = output.takeUnits(length + literalUnits)) {
+            copyPass({text, length}, out);
+        } else {
+            for (std::size_t i = 0; i < pieces.size(); ++i) {
+                current = pieces[i];
+                put(literals[i].empty() ? std::u16string_view(text, length) : literals[i]);
+            }
+        }
+        ++done;
     }
     if (done != 0) source.skipArguments(done);
 }

@@ -10,8 +10,6 @@
 
 namespace Orvandeil::FileIO::detail {
 
-class AsciiOutput;
-
 // A format of one "%s" without width and precision, and text around it, that goes to a string of
 // UTF-16: whole char arrays are copied there one after the other.
 class WordProgram {
@@ -30,7 +28,6 @@ public:
 private:
     bool compile();
     void put(std::u16string_view text) const;
-    void printPass(std::u16string_view word, AsciiOutput& output, foutFormatPiece*& current) const;
     void copyPass(std::u16string_view word, char16_t* out) const;
 
     Pieces pieces;
