@@ -8,7 +8,6 @@
 #include "fileio/text/output_string_stream.h"
 #include "fileio/text/std_err_stream.h"
 
-#include <algorithm>
 #include <cerrno>
 #include <utility>
 #include <vector>
@@ -56,8 +55,11 @@ bool holdsOnlyAscii(const std::string& name) {
     if (!file) return false;
     std::vector<char> piece(constants::transferPieceBytes);
     while (const std::size_t count = std::fread(piece.data(), 1, piece.size(), file.get())) {
-        const auto isOther = [](char byte) { return (byte & 0x80) != 0 || byte == 0; };
-        if (std::any_of(piece.data(), piece.data() + count, isOther)) return false;
+        // Without an early end, so that it is done for many bytes at once.
+        bool isOther = false;
+        for (std::size_t i = 0; i < count; ++i)
+            isOther |= static_cast<signed char>(piece[i]) <= 0;
+        if (isOther) return false;
     }
     return std::ferror(file.get()) == 0;
 }

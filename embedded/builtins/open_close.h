@@ -19,8 +19,7 @@ struct OpenRequest {
 
 // Opens a file by its name in bytes. Permission, machine format and encoding are validated in this
 // order, with the errors that they raise, before the file is touched. CodeError with the errno of a
-// failed open; a directory is refused. A pipe that is read from is first copied to an anonymous
-// file.
+// failed open; a directory is refused.
 std::unique_ptr<OpenFile> openFile(const std::string& name, const OpenRequest& request);
 
 // Standard input. One that cannot seek is first copied to an anonymous file. CodeError when it

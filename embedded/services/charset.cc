@@ -1,6 +1,7 @@
 #include "embedded/services/charset.h"
 
 #include "fileio/host/text.h"
+#include "fileio/text/owned_converter.h"
 
 #include <algorithm>
 #include <cstdint>
@@ -60,10 +61,6 @@ std::string converterName(std::string_view detected) {
     return std::string(detected);
 }
 
-struct ConverterCloser {
-    void operator()(UConverter* converter) const noexcept { ucnv_close(converter); }
-};
-
 }  // namespace
 
 WithdrawnEncoding::WithdrawnEncoding(std::string canonicalName) {
@@ -82,7 +79,7 @@ bool vxTextEncodingIsSupported(const char* canonicalName) {
     const auto& withdrawn = withdrawnEncodings();
     if (std::count(withdrawn.begin(), withdrawn.end(), canonicalName) != 0) return false;
     UErrorCode status = U_ZERO_ERROR;
-    const std::unique_ptr<UConverter, ConverterCloser> converter(ucnv_open(canonicalName, &status));
+    const Orvandeil::FileIO::detail::OwnedConverter converter(ucnv_open(canonicalName, &status));
     return U_SUCCESS(status);
 }
 

@@ -186,13 +186,12 @@ bool TcodnStream::hasState() const {
 void TcodnStream::forgetUnread() {
     unitGivenBack.reset();
     if (converterHolds && !hasState()) ucnv_resetToUnicode(converter);
-    char16_t unit;
-    char16_t* target;
-    do {
-        target = &unit;
-        if (converterHolds) takeHeldUnit(converter, false, target);
-    } while (target != &unit);
-    converterHolds = false;
+    while (converterHolds) {
+        char16_t unit;
+        char16_t* target = &unit;
+        takeHeldUnit(converter, false, target);
+        converterHolds = target != &unit;
+    }
     midCharacter = false;
 }
 
